@@ -1,0 +1,101 @@
+// The byte stream base classes.
+//
+// An input stream hands out one byte at a time (IByteStream::Get), an output stream takes
+// one byte at a time (OByteStream::Put); block transfer, the typed big-endian operators
+// (<kelcore/filesupport/ByteStreamOperators.h>) and the stream-to-stream copy are built
+// on those two calls. Concrete streams derive from IByteStream or OByteStream.
+//
+// ByteStream_base carries per-stream extension storage in the manner of std::ios_base:
+// integer words, pointer words and callbacks that run when the stream is destroyed.
+//
+// Streams are single-threaded objects with no locking; one thread at a time may use a
+// stream. xalloc may be called from any thread (the counter is atomic), but indices are
+// usually taken once at start-up. Streams are neither copyable nor movable.
+#pragma once
+
+#include <cstdint>
+#include <utility>
+#include <vector>
+
+#include <kelcore/Export.h>
+
+namespace kelcore::filesupport {
+
+class KELCORE_API ByteStream_base {
+ public:
+  // Events passed to callbacks. The library raises only kEraseEvent (value 0), once, from
+  // the destructor.
+  enum event { kEraseEvent = 0 };
+  using event_callback = void (*)(event, ByteStream_base&, int);
+
+  ByteStream_base(const ByteStream_base&) = delete;
+  ByteStream_base& operator=(const ByteStream_base&) = delete;
+
+  // Calls every registered callback, first registered first, as fn(kEraseEvent, *this,
+  // index). Callbacks must not throw (a throwing callback ends the program).
+  virtual ~ByteStream_base();
+
+  // A process-wide index usable with iword/pword of any stream: 0 on the first call, then
+  // 1, 2, ...
+  static int xalloc();
+
+  // The integer (pointer) word at `index`. The array grows to index + 1 elements when
+  // needed, new elements zero (null). The reference stays valid until a later call grows
+  // the array. A negative index raises std::out_of_range.
+  long& iword(int index);
+  void*& pword(int index);
+
+  // Appends (fn, index) to the callbacks; no duplicate check.
+  void register_callback(event_callback fn, int index);
+
+ protected:
+  ByteStream_base() = default;
+
+ private:
+  std::vector<long> iwords_;
+  std::vector<void*> pwords_;
+  std::vector<std::pair<event_callback, int>> callbacks_;
+};
+
+// Base of every input stream. Positions and lengths are byte counts from the start.
+class KELCORE_API IByteStream : public ByteStream_base {
+ public:
+  IByteStream() = default;
+  ~IByteStream() override;
+
+  // The next byte; the position moves on by one. Streams with a known end raise
+  // eof_error when no byte is left.
+  virtual unsigned char Get() = 0;
+  // `count` bytes into dst, as `count` calls of Get (a stream may do it faster with the
+  // same result). If Get raises part way, the bytes before it have been stored.
+  virtual void ReadBlock(unsigned char* dst, unsigned long count);
+  virtual void CurPos(unsigned long long pos) = 0;
+  virtual unsigned long long CurPos() const = 0;
+  // CurPos() == Length().
+  virtual bool AtTheEnd() const;
+  // The length in bytes; 0 means that the length is not known.
+  virtual unsigned long long Length() const;
+};
+
+// Base of every output stream.
+class KELCORE_API OByteStream : public ByteStream_base {
+ public:
+  OByteStream() = default;
+  ~OByteStream() override;
+
+  // Appends or overwrites one byte at the current position; the position moves on by one.
+  virtual void Put(unsigned char byte) = 0;
+  // `count` bytes from src, as `count` calls of Put (a stream may do it faster with the
+  // same result).
+  virtual void WriteBlock(const unsigned char* src, unsigned long count);
+  virtual void CurPos(unsigned long long pos) = 0;
+  virtual unsigned long long CurPos() const = 0;
+  // Pushes everything written so far down to the operating system, and cuts the
+  // destination to `length` bytes. Only streams with an operating-system or resizable
+  // destination implement these; on the others a call is a program fault: it is reported
+  // on standard error and the process is aborted.
+  virtual void OSFlush();
+  virtual void Truncate(unsigned long long length);
+};
+
+}  // namespace kelcore::filesupport
