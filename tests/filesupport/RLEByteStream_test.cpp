@@ -66,9 +66,10 @@ Bytes Counting(std::size_t n) {
 TEST(RLEByteStream, PacketVectors) {
   Bytes run200 = {0x81, 0x55, 0xB9, 0x55};
   Bytes literal130 = Counting(130);
-  Bytes expected130 = {0x7F};
-  expected130.insert(expected130.end(), literal130.begin(), literal130.begin() + 128);
-  expected130.insert(expected130.end(), {0x01, 0x80, 0x81});
+  // 130 counting bytes: a literal packet of 128, then one of the last two.
+  Bytes expected130 = Counting(130);
+  expected130.insert(expected130.begin() + 128, 0x01);
+  expected130.insert(expected130.begin(), 0x7F);
   const std::pair<Bytes, Bytes> cases[] = {
       {{0x41, 0x41, 0x41, 0x41}, {0xFD, 0x41}},
       {{0x41, 0x42, 0x43}, {0x02, 0x41, 0x42, 0x43}},
