@@ -16,7 +16,7 @@ ByteVector Bytes(const std::string& text) {
   return ByteVector(text.begin(), text.end());
 }
 
-// RFC 4648 section 10, plus the two characters above "9" and the design's example.
+// RFC 4648 section 10, plus the two characters above "9" and a two-byte example.
 TEST(Base64, EncodeVectors) {
   const std::pair<std::string, std::string> cases[] = {
       {"", ""},

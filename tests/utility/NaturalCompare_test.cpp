@@ -21,7 +21,7 @@ struct OrderCase {
   long insensitive;  // CaseInsensitive::NaturalStringCompare(a, b)
 };
 
-// Worked examples of the natural order, including the design's own edge cases.
+// Worked examples of the natural order, edge cases included.
 const OrderCase kOrderCases[] = {
     {u"file2", u"file10", -1, -1},
     {u"a007", u"a7", 0, 0},
