@@ -1,7 +1,9 @@
 #include <kelcore/utility/UnicodeConversion.h>
 
+#include <bit>
 #include <cstddef>
 #include <cstdint>
+#include <cstring>
 #include <string>
 
 #include "utility/UnicodeDecodeBlocks.h"
@@ -31,36 +33,53 @@ bool IsContinuation(unsigned byte) {
 // Writes the units of [s, end) one at a time from the current one on, until two ASCII
 // units in a row suggest a run for the block writer. Single ASCII units between other
 // characters (spaces between emoji, letters between accents) are cheaper here. `out`
-// has room for the whole conversion, which ends at `outEnd`.
-void EncodeUnitsUntilAsciiRun(const UTF16Char*& s, const UTF16Char* end, unsigned char*& out,
-                              const unsigned char* outEnd) {
+// has room for the whole conversion, which ends at `outEnd`, unless `roomForLone` is
+// false: then the room counted lone surrogates as 2 bytes, and the writer stops before
+// the first one. Returns false if it stopped there, true otherwise.
+bool EncodeUnitsUntilAsciiRun(const UTF16Char*& s, const UTF16Char* end, unsigned char*& out,
+                              const unsigned char* outEnd, bool roomForLone) {
   int asciiInARow = 0;
   while (s < end) {
     const unsigned unit = *s;
     if (unit < 0x80) {
       *out++ = static_cast<unsigned char>(unit);
       ++s;
-      if (++asciiInARow == 2) return;
+      if (++asciiInARow == 2) return true;
       continue;
     }
     asciiInARow = 0;
     if (unit < 0x800) {
-      out[0] = static_cast<unsigned char>(0xC0 | (unit >> 6));
-      out[1] = static_cast<unsigned char>(0x80 | (unit & 0x3F));
+      if constexpr (std::endian::native == std::endian::little) {
+        // One 16-bit store, first byte lowest.
+        const std::uint16_t bytes =
+            static_cast<std::uint16_t>(0x80C0 | (unit >> 6) | ((unit & 0x3F) << 8));
+        std::memcpy(out, &bytes, 2);
+      } else {
+        out[0] = static_cast<unsigned char>(0xC0 | (unit >> 6));
+        out[1] = static_cast<unsigned char>(0x80 | (unit & 0x3F));
+      }
       out += 2;
       ++s;
       // A second such unit suggests a run: try whole blocks.
       if (s < end && *s >= 0x80 && *s < 0x800) detail::EncodeTwoByteRun(s, end, out, outEnd);
     } else if (IsHighSurrogate(unit) && end - s > 1 && IsLowSurrogate(s[1])) {
       const std::uint32_t cp = ((unit - 0xD800) << 10) + (s[1] - 0xDC00u) + 0x10000;
-      out[0] = static_cast<unsigned char>(0xF0 | (cp >> 18));
-      out[1] = static_cast<unsigned char>(0x80 | ((cp >> 12) & 0x3F));
-      out[2] = static_cast<unsigned char>(0x80 | ((cp >> 6) & 0x3F));
-      out[3] = static_cast<unsigned char>(0x80 | (cp & 0x3F));
+      if constexpr (std::endian::native == std::endian::little) {
+        // One 32-bit store, first byte lowest.
+        const std::uint32_t bytes = 0x808080F0u | (cp >> 18) | ((cp >> 4) & 0x3F00) |
+                                    ((cp << 10) & 0x3F0000) | ((cp & 0x3F) << 24);
+        std::memcpy(out, &bytes, 4);
+      } else {
+        out[0] = static_cast<unsigned char>(0xF0 | (cp >> 18));
+        out[1] = static_cast<unsigned char>(0x80 | ((cp >> 12) & 0x3F));
+        out[2] = static_cast<unsigned char>(0x80 | ((cp >> 6) & 0x3F));
+        out[3] = static_cast<unsigned char>(0x80 | (cp & 0x3F));
+      }
       out += 4;
       s += 2;
     } else {
       // Lone surrogates too are written as the three bytes of their own value.
+      if (!roomForLone && (unit & 0xF800) == 0xD800) return false;
       out[0] = static_cast<unsigned char>(0xE0 | (unit >> 12));
       out[1] = static_cast<unsigned char>(0x80 | ((unit >> 6) & 0x3F));
       out[2] = static_cast<unsigned char>(0x80 | (unit & 0x3F));
@@ -69,24 +88,35 @@ void EncodeUnitsUntilAsciiRun(const UTF16Char*& s, const UTF16Char* end, unsigne
       if (s < end && *s >= 0x800) detail::EncodeThreeByteRun(s, end, out, outEnd);
     }
   }
+  return true;
 }
 
 UTF8String ConvertUTF16ToUTF8(const UTF16Char* text, std::size_t count) {
   UTF8String result;
   if (count == 0) return result;
-  const detail::UTF16Measure measure = detail::MeasureUTF16(text, text + count);
+  // Sized for surrogate pairs; a lone surrogate, rare, takes one byte more, and the
+  // first one met resizes the string for the exact remainder.
+  const detail::UTF16Measure measure = detail::MeasureUTF16Paired(text, text + count);
   // A short input holding a NUL keeps its length: the units after the NUL become zero
   // bytes. Longer inputs end at the NUL.
   const std::size_t padding = count < 4 ? count - measure.units : 0;
   result.resize(measure.bytes + padding);
 
   unsigned char* out = result.data();
-  const unsigned char* const outEnd = out + measure.bytes;
+  const unsigned char* outEnd = out + measure.bytes;
   const UTF16Char* s = text;
   const UTF16Char* const end = text + measure.units;
+  bool roomForLone = false;
   while (s < end) {
     detail::NarrowAsciiRun(s, end, out);
-    EncodeUnitsUntilAsciiRun(s, end, out, outEnd);
+    if (!EncodeUnitsUntilAsciiRun(s, end, out, outEnd, roomForLone)) {
+      const std::size_t written = static_cast<std::size_t>(out - result.data());
+      const std::size_t bytes = written + detail::MeasureUTF16(s, end).bytes;
+      result.resize(bytes + padding);
+      out = result.data() + written;
+      outEnd = result.data() + bytes;
+      roomForLone = true;
+    }
   }
   return result;
 }

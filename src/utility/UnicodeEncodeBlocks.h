@@ -135,6 +135,106 @@ inline UTF16Measure MeasureUTF16(const UTF16Char* begin, const UTF16Char* end) {
   return {static_cast<std::size_t>(s - begin), bytes};
 }
 
+// Measures [begin, end) up to its first NUL unit like MeasureUTF16, faster, by counting
+// every surrogate unit as 2 bytes: exact for text whose surrogates all pair up, and
+// short by one byte per lone surrogate otherwise (never more than MeasureUTF16; the
+// scalar form, and the tail of the vector forms, count lone surrogates exactly).
+// Reads only inside [begin, end).
+inline UTF16Measure MeasureUTF16Paired(const UTF16Char* begin, const UTF16Char* end) {
+  const UTF16Char* s = begin;
+  std::size_t bytes = 0;
+  // Blocks of 16 units, as in MeasureUTF16, but without the look-ahead: each lane adds
+  // 3, less 1 below 0x800, less 1 more below 0x80, less 1 for a surrogate.
+  constexpr int kGroupBlocks = 16;
+#if defined(KELCORE_UNICODE_SSE2)
+  const __m128i one = _mm_set1_epi16(1);
+  const __m128i asciiBias = _mm_set1_epi16(0x7F81);
+  const __m128i signBit = _mm_set1_epi16(-0x8000);
+  // Signed comparisons of unit ^ 8000 order the units as unsigned.
+  const __m128i below80 = _mm_set1_epi16(-0x7F80);
+  const __m128i below800 = _mm_set1_epi16(-0x7800);
+  // Surrogates D800-DFFF flip to 5800-5FFF.
+  const __m128i top5 = _mm_set1_epi16(-0x800);
+  const __m128i surrogates = _mm_set1_epi16(0x5800);
+  // A group with a NUL, found from its lowest flipped unit, is left to the scalar loop.
+  while (end - s >= 16) {
+    const __m128i v0 = _mm_loadu_si128(reinterpret_cast<const __m128i*>(s));
+    const __m128i v1 = _mm_loadu_si128(reinterpret_cast<const __m128i*>(s + 8));
+    // Units 1-7F stay below 8000 after subtracting 1 (0 wraps) and adding 7F81.
+    const __m128i biased = _mm_or_si128(_mm_adds_epu16(_mm_sub_epi16(v0, one), asciiBias),
+                                        _mm_adds_epu16(_mm_sub_epi16(v1, one), asciiBias));
+    if ((_mm_movemask_epi8(biased) & 0xAAAA) == 0) {
+      bytes += 16;
+      s += 16;
+      continue;
+    }
+    __m128i acc = _mm_setzero_si128();  // at least -6 per lane and block
+    __m128i lowest = _mm_set1_epi16(0x7FFF);
+    const int blocks =
+        end - s >= 16 * kGroupBlocks ? kGroupBlocks : static_cast<int>((end - s) / 16);
+    for (const UTF16Char* p = s; p < s + 16 * blocks; p += 16) {
+      const __m128i f0 =
+          _mm_xor_si128(_mm_loadu_si128(reinterpret_cast<const __m128i*>(p)), signBit);
+      const __m128i f1 =
+          _mm_xor_si128(_mm_loadu_si128(reinterpret_cast<const __m128i*>(p + 8)), signBit);
+      lowest = _mm_min_epi16(lowest, _mm_min_epi16(f0, f1));
+      const __m128i small =
+          _mm_add_epi16(_mm_add_epi16(_mm_cmplt_epi16(f0, below80), _mm_cmplt_epi16(f0, below800)),
+                        _mm_add_epi16(_mm_cmplt_epi16(f1, below80), _mm_cmplt_epi16(f1, below800)));
+      const __m128i surrogate = _mm_add_epi16(_mm_cmpeq_epi16(_mm_and_si128(f0, top5), surrogates),
+                                              _mm_cmpeq_epi16(_mm_and_si128(f1, top5), surrogates));
+      acc = _mm_add_epi16(acc, _mm_add_epi16(small, surrogate));
+    }
+    if (_mm_movemask_epi8(_mm_cmpeq_epi16(lowest, signBit)) != 0) break;
+    alignas(16) std::int32_t lanes[4];
+    _mm_store_si128(reinterpret_cast<__m128i*>(lanes), _mm_madd_epi16(acc, one));
+    bytes += static_cast<std::size_t>(48 * blocks + lanes[0] + lanes[1] + lanes[2] + lanes[3]);
+    s += 16 * blocks;
+  }
+#elif defined(KELCORE_UNICODE_NEON)
+  auto load = [](const UTF16Char* p) {
+    return vld1q_u16(reinterpret_cast<const std::uint16_t*>(p));
+  };
+  auto laneShortfall = [](uint16x8_t v) {  // 0 to 3: bytes less than 3
+    const uint16x8_t surrogate = vceqq_u16(vandq_u16(v, vdupq_n_u16(0xF800)), vdupq_n_u16(0xD800));
+    const uint16x8_t masks = vaddq_u16(
+        vaddq_u16(vcltq_u16(v, vdupq_n_u16(0x80)), vcltq_u16(v, vdupq_n_u16(0x800))), surrogate);
+    return vnegq_s16(vreinterpretq_s16_u16(masks));
+  };
+  bool nul = false;
+  while (!nul && end - s >= 16) {
+    const uint16x8_t one = vdupq_n_u16(1);
+    // Units 1-7F are below 7F after subtracting 1 (0 wraps).
+    if (vmaxvq_u16(vmaxq_u16(vsubq_u16(load(s), one), vsubq_u16(load(s + 8), one))) < 0x7F) {
+      bytes += 16;
+      s += 16;
+      continue;
+    }
+    int16x8_t acc = vdupq_n_s16(0);
+    int blocks = 0;
+    for (; blocks < kGroupBlocks && end - s >= 16; ++blocks, s += 16) {
+      const uint16x8_t w0 = load(s);
+      const uint16x8_t w1 = load(s + 8);
+      if (vminvq_u16(vminq_u16(w0, w1)) == 0) {
+        nul = true;
+        break;
+      }
+      acc = vaddq_s16(acc, vaddq_s16(laneShortfall(w0), laneShortfall(w1)));
+    }
+    bytes += static_cast<std::size_t>(48 * blocks - vaddlvq_s16(acc));
+  }
+#else
+  (void)kGroupBlocks;
+#endif
+  // The low half of a pair split by the blocks' end was counted with its high half.
+  if (s > begin && s < end && IsLowSurrogate(*s) && IsHighSurrogate(s[-1])) {
+    bytes += 2;
+    ++s;
+  }
+  const UTF16Measure rest = MeasureUTF16(s, end);
+  return {static_cast<std::size_t>(s - begin) + rest.units, bytes + rest.bytes};
+}
+
 // Writes the leading units of [s, end) that are below 0x80 to `out` as bytes and
 // advances both past them. `out` must have room for end - s bytes; bytes past the run
 // may be written too, to be overwritten by the caller.
