@@ -16,6 +16,27 @@
 
 namespace kelcore::utility::detail {
 
+// True when all 16 units at `s` lie in 1-7F: ASCII without a NUL. Subtracting 1 wraps a
+// NUL to FFFF, so one unsigned range test rejects both NULs and non-ASCII units.
+#if defined(KELCORE_UNICODE_SSE2)
+inline bool IsAsciiBlockWithoutNul(const UTF16Char* s) {
+  const __m128i one = _mm_set1_epi16(1);
+  const __m128i asciiBias = _mm_set1_epi16(0x7F81);  // 1-7F, less 1, stay below 8000
+  const __m128i v0 = _mm_loadu_si128(reinterpret_cast<const __m128i*>(s));
+  const __m128i v1 = _mm_loadu_si128(reinterpret_cast<const __m128i*>(s + 8));
+  const __m128i biased = _mm_or_si128(_mm_adds_epu16(_mm_sub_epi16(v0, one), asciiBias),
+                                      _mm_adds_epu16(_mm_sub_epi16(v1, one), asciiBias));
+  return (_mm_movemask_epi8(biased) & 0xAAAA) == 0;
+}
+#elif defined(KELCORE_UNICODE_NEON)
+inline bool IsAsciiBlockWithoutNul(const UTF16Char* s) {
+  const uint16x8_t one = vdupq_n_u16(1);
+  const uint16x8_t v0 = vld1q_u16(reinterpret_cast<const std::uint16_t*>(s));
+  const uint16x8_t v1 = vld1q_u16(reinterpret_cast<const std::uint16_t*>(s + 8));
+  return vmaxvq_u16(vmaxq_u16(vsubq_u16(v0, one), vsubq_u16(v1, one))) < 0x7F;
+}
+#endif
+
 inline bool IsHighSurrogate(unsigned unit) {
   return (unit & 0xFC00) == 0xD800;
 }
@@ -43,7 +64,6 @@ inline UTF16Measure MeasureUTF16(const UTF16Char* begin, const UTF16Char* end) {
 #if defined(KELCORE_UNICODE_SSE2)
   const __m128i zero = _mm_setzero_si128();
   const __m128i one = _mm_set1_epi16(1);
-  const __m128i asciiBias = _mm_set1_epi16(0x7F81);
   auto laneBytes = [&](__m128i v, __m128i next) {
     const __m128i ascii = _mm_cmpeq_epi16(_mm_and_si128(v, _mm_set1_epi16(-0x80)), zero);
     const __m128i below800 = _mm_cmpeq_epi16(_mm_and_si128(v, _mm_set1_epi16(-0x800)), zero);
@@ -56,12 +76,7 @@ inline UTF16Measure MeasureUTF16(const UTF16Char* begin, const UTF16Char* end) {
   };
   bool nul = false;
   while (!nul && end - s > 16) {
-    const __m128i v0 = _mm_loadu_si128(reinterpret_cast<const __m128i*>(s));
-    const __m128i v1 = _mm_loadu_si128(reinterpret_cast<const __m128i*>(s + 8));
-    // Units 1-7F stay below 8000 after subtracting 1 (0 wraps) and adding 7F81.
-    const __m128i biased = _mm_or_si128(_mm_adds_epu16(_mm_sub_epi16(v0, one), asciiBias),
-                                        _mm_adds_epu16(_mm_sub_epi16(v1, one), asciiBias));
-    if ((_mm_movemask_epi8(biased) & 0xAAAA) == 0) {
+    if (IsAsciiBlockWithoutNul(s)) {
       bytes += 16;
       s += 16;
       continue;
@@ -101,9 +116,7 @@ inline UTF16Measure MeasureUTF16(const UTF16Char* begin, const UTF16Char* end) {
   };
   bool nul = false;
   while (!nul && end - s > 16) {
-    const uint16x8_t one = vdupq_n_u16(1);
-    // Units 1-7F are below 7F after subtracting 1 (0 wraps).
-    if (vmaxvq_u16(vmaxq_u16(vsubq_u16(load(s), one), vsubq_u16(load(s + 8), one))) < 0x7F) {
+    if (IsAsciiBlockWithoutNul(s)) {
       bytes += 16;
       s += 16;
       continue;
@@ -148,7 +161,6 @@ inline UTF16Measure MeasureUTF16Paired(const UTF16Char* begin, const UTF16Char* 
   constexpr int kGroupBlocks = 16;
 #if defined(KELCORE_UNICODE_SSE2)
   const __m128i one = _mm_set1_epi16(1);
-  const __m128i asciiBias = _mm_set1_epi16(0x7F81);
   const __m128i signBit = _mm_set1_epi16(-0x8000);
   // Signed comparisons of unit ^ 8000 order the units as unsigned.
   const __m128i below80 = _mm_set1_epi16(-0x7F80);
@@ -158,12 +170,7 @@ inline UTF16Measure MeasureUTF16Paired(const UTF16Char* begin, const UTF16Char* 
   const __m128i surrogates = _mm_set1_epi16(0x5800);
   // A group with a NUL, found from its lowest flipped unit, is left to the scalar loop.
   while (end - s >= 16) {
-    const __m128i v0 = _mm_loadu_si128(reinterpret_cast<const __m128i*>(s));
-    const __m128i v1 = _mm_loadu_si128(reinterpret_cast<const __m128i*>(s + 8));
-    // Units 1-7F stay below 8000 after subtracting 1 (0 wraps) and adding 7F81.
-    const __m128i biased = _mm_or_si128(_mm_adds_epu16(_mm_sub_epi16(v0, one), asciiBias),
-                                        _mm_adds_epu16(_mm_sub_epi16(v1, one), asciiBias));
-    if ((_mm_movemask_epi8(biased) & 0xAAAA) == 0) {
+    if (IsAsciiBlockWithoutNul(s)) {
       bytes += 16;
       s += 16;
       continue;
@@ -203,9 +210,7 @@ inline UTF16Measure MeasureUTF16Paired(const UTF16Char* begin, const UTF16Char* 
   };
   bool nul = false;
   while (!nul && end - s >= 16) {
-    const uint16x8_t one = vdupq_n_u16(1);
-    // Units 1-7F are below 7F after subtracting 1 (0 wraps).
-    if (vmaxvq_u16(vmaxq_u16(vsubq_u16(load(s), one), vsubq_u16(load(s + 8), one))) < 0x7F) {
+    if (IsAsciiBlockWithoutNul(s)) {
       bytes += 16;
       s += 16;
       continue;
