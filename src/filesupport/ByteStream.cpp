@@ -27,8 +27,11 @@ T& GrowToIndex(std::vector<T>& words, int index) {
 
 }  // namespace
 
-ByteStream_base::~ByteStream_base() {
-  for (const auto& [fn, index] : callbacks_) fn(kEraseEvent, *this, index);
+ByteStream_base::~ByteStream_base() noexcept(false) {
+  // A throwing callback ends the program even though this destructor may throw.
+  [this]() noexcept {
+    for (const auto& [fn, index] : callbacks_) fn(kEraseEvent, *this, index);
+  }();
 }
 
 int ByteStream_base::xalloc() {

@@ -1,26 +1,138 @@
 #include <kelcore/filesupport/ByteStreamOperators.h>
 
+#include <algorithm>
 #include <charconv>
 #include <climits>
+#include <cstddef>
 #include <cstdint>
+#include <cstring>
 #include <limits>
 #include <stdexcept>
+#include <type_traits>
+#include <utility>
 
 namespace kelcore::filesupport {
+namespace detail {
+
+// Moves bytes through a stream's get or put area where it has one, and through the virtual
+// Get/Put for every byte outside it: the same effect as one Get/Put per byte.
+class StreamAreas {
+ public:
+  static std::size_t Readable(const IByteStream& in) {
+    return static_cast<std::size_t>(in.egptr_ - in.gptr_);
+  }
+  static std::size_t Writable(const OByteStream& out) {
+    return static_cast<std::size_t>(out.epptr_ - out.pptr_);
+  }
+
+  static unsigned char Get(IByteStream& in) {
+    return in.gptr_ != in.egptr_ ? *in.gptr_++ : in.Get();
+  }
+  static void Put(OByteStream& out, unsigned char byte) {
+    if (out.pptr_ != out.epptr_) {
+      *out.pptr_++ = byte;
+    } else {
+      out.Put(byte);
+    }
+  }
+
+  // The next `count` bytes of the get area, consumed; the area must hold them.
+  static const unsigned char* Take(IByteStream& in, std::size_t count) {
+    const unsigned char* const bytes = in.gptr_;
+    in.gptr_ += count;
+    return bytes;
+  }
+
+  // Stores `count` bytes. The common case, all of them in the area, stays small enough to
+  // inline; the rest is out of line.
+  static void Put(OByteStream& out, const unsigned char* src, std::size_t count) {
+    if (Writable(out) >= count) {
+      if (count != 0) std::memcpy(out.pptr_, src, count);
+      out.pptr_ += count;
+    } else {
+      PutAcrossArea(out, src, count);
+    }
+  }
+
+  [[gnu::noinline]] static void GetAcrossArea(IByteStream& in, unsigned char* dst,
+                                              std::size_t count) {
+    while (count != 0) {
+      const std::size_t n = std::min(Readable(in), count);
+      if (n == 0) {
+        *dst++ = in.Get();
+        --count;
+        continue;
+      }
+      std::memcpy(dst, in.gptr_, n);
+      in.gptr_ += n;
+      dst += n;
+      count -= n;
+    }
+  }
+
+  [[gnu::noinline]] static void PutAcrossArea(OByteStream& out, const unsigned char* src,
+                                              std::size_t count) {
+    while (count != 0) {
+      const std::size_t n = std::min(Writable(out), count);
+      if (n == 0) {
+        out.Put(*src++);
+        --count;
+        continue;
+      }
+      std::memcpy(out.pptr_, src, n);
+      out.pptr_ += n;
+      src += n;
+      count -= n;
+    }
+  }
+
+  // Appends up to `count` bytes of the get area to `text` (not beyond its max_size) and
+  // returns how many; 0 when the area is empty or the text is full.
+  template <typename Text>
+  static std::size_t AppendFromArea(IByteStream& in, Text& text, std::uint64_t count) {
+    const std::size_t n = static_cast<std::size_t>(
+        std::min<std::uint64_t>({Readable(in), count, text.max_size() - text.size()}));
+    if (n != 0) {
+      text.append(reinterpret_cast<const typename Text::value_type*>(in.gptr_), n);
+      in.gptr_ += n;
+    }
+    return n;
+  }
+
+  // Moves up to `count` bytes from the get area of `in` to the put area of `out`; returns
+  // how many.
+  static std::uint64_t CopyBetweenAreas(IByteStream& in, OByteStream& out, std::uint64_t count) {
+    const std::size_t n =
+        static_cast<std::size_t>(std::min<std::uint64_t>({Readable(in), Writable(out), count}));
+    if (n != 0) {
+      std::memcpy(out.pptr_, in.gptr_, n);
+      in.gptr_ += n;
+      out.pptr_ += n;
+    }
+    return n;
+  }
+};
+
+}  // namespace detail
+
 namespace {
+
+using detail::StreamAreas;
 
 template <int Bytes>
 void PutBigEndian(OByteStream& out, std::uint64_t value) {
-  for (int shift = (Bytes - 1) * 8; shift >= 0; shift -= 8) {
-    out.Put(static_cast<unsigned char>(value >> shift));
+  unsigned char bytes[Bytes];
+  for (int i = 0; i < Bytes; ++i) {
+    bytes[i] = static_cast<unsigned char>(value >> ((Bytes - 1 - i) * 8));
   }
+  StreamAreas::Put(out, bytes, Bytes);
 }
 
-template <int Bytes>
-std::uint64_t GetBigEndian(IByteStream& in) {
-  std::uint64_t value = 0;
-  for (int i = 0; i < Bytes; ++i) value = (value << 8) | in.Get();
-  return value;
+// Written out as one expression, which compilers turn into a load and a byte swap.
+template <std::size_t... I>
+std::uint64_t FromBigEndian(const unsigned char* bytes, std::index_sequence<I...>) {
+  constexpr std::size_t kLast = sizeof...(I) - 1;
+  return ((std::uint64_t{bytes[I]} << (8 * (kLast - I))) | ...);
 }
 
 // Sign-extends the low `Bytes` bytes of `raw`.
@@ -28,6 +140,45 @@ template <int Bytes>
 std::int64_t SignExtend(std::uint64_t raw) {
   constexpr int kUnused = 64 - Bytes * 8;
   return static_cast<std::int64_t>(raw << kUnused) >> kUnused;
+}
+
+// A field's value as the type it is read into: sign-extended for signed types.
+template <typename T, int Bytes>
+T FromField(std::uint64_t raw) {
+  if constexpr (std::is_signed_v<T>) {
+    return static_cast<T>(SignExtend<Bytes>(raw));
+  } else {
+    return static_cast<T>(raw);
+  }
+}
+
+template <int Bytes>
+[[gnu::noinline]] std::uint64_t GetBigEndianAcrossArea(IByteStream& in) {
+  unsigned char bytes[Bytes];
+  StreamAreas::GetAcrossArea(in, bytes, Bytes);
+  return FromBigEndian(bytes, std::make_index_sequence<Bytes>());
+}
+
+template <int Bytes>
+std::uint64_t GetBigEndian(IByteStream& in) {
+  if (StreamAreas::Readable(in) < Bytes) return GetBigEndianAcrossArea<Bytes>(in);
+  return FromBigEndian(StreamAreas::Take(in, Bytes), std::make_index_sequence<Bytes>());
+}
+
+template <int Bytes, typename T>
+[[gnu::noinline]] IByteStream& ExtractAcrossArea(IByteStream& in, T& value) {
+  value = FromField<T, Bytes>(GetBigEndianAcrossArea<Bytes>(in));
+  return in;
+}
+
+// Reads a big-endian field into `value`. The common case, the whole field in the get
+// area, is a load and a byte swap; the rest leaves by a tail call.
+template <int Bytes, typename T>
+IByteStream& Extract(IByteStream& in, T& value) {
+  if (StreamAreas::Readable(in) < Bytes) return ExtractAcrossArea<Bytes>(in, value);
+  value = FromField<T, Bytes>(
+      FromBigEndian(StreamAreas::Take(in, Bytes), std::make_index_sequence<Bytes>()));
+  return in;
 }
 
 // A corrupt length may ask for more than a string can hold.
@@ -40,15 +191,21 @@ void AppendUnit(Text& text, typename Text::value_type unit) {
 template <typename Text>
 void PutText(OByteStream& out, const Text& text) {
   PutBigEndian<8>(out, text.size());
-  for (const auto c : text) out.Put(static_cast<unsigned char>(c));
+  StreamAreas::Put(out, reinterpret_cast<const unsigned char*>(text.data()), text.size());
 }
 
 template <typename Text>
 void GetText(IByteStream& in, Text& text) {
   text.clear();
-  const std::uint64_t length = GetBigEndian<8>(in);
-  for (std::uint64_t i = 0; i < length; ++i) {
-    AppendUnit(text, static_cast<typename Text::value_type>(in.Get()));
+  std::uint64_t remaining = GetBigEndian<8>(in);
+  while (remaining != 0) {
+    const std::size_t taken = StreamAreas::AppendFromArea(in, text, remaining);
+    if (taken != 0) {
+      remaining -= taken;
+    } else {
+      AppendUnit(text, static_cast<typename Text::value_type>(StreamAreas::Get(in)));
+      --remaining;
+    }
   }
 }
 
@@ -59,8 +216,9 @@ void PutFloat(OByteStream& out, Float value) {
   char text[64];
   const auto result =
       std::to_chars(text, text + sizeof text, value, std::chars_format::general, 36);
-  PutBigEndian<8>(out, static_cast<std::uint64_t>(result.ptr - text));
-  for (const char* p = text; p != result.ptr; ++p) out.Put(static_cast<unsigned char>(*p));
+  const auto length = static_cast<std::size_t>(result.ptr - text);
+  PutBigEndian<8>(out, length);
+  StreamAreas::Put(out, reinterpret_cast<const unsigned char*>(text), length);
 }
 
 bool IsClassicSpace(char c) {
@@ -99,23 +257,23 @@ void CheckLongWidth(unsigned long value) {
 }  // namespace
 
 OByteStream& operator<<(OByteStream& out, char value) {
-  out.Put(static_cast<unsigned char>(value));
+  StreamAreas::Put(out, static_cast<unsigned char>(value));
   return out;
 }
 OByteStream& operator<<(OByteStream& out, signed char value) {
-  out.Put(static_cast<unsigned char>(value));
+  StreamAreas::Put(out, static_cast<unsigned char>(value));
   return out;
 }
 OByteStream& operator<<(OByteStream& out, unsigned char value) {
-  out.Put(value);
+  StreamAreas::Put(out, value);
   return out;
 }
 OByteStream& operator<<(OByteStream& out, bool value) {
-  out.Put(value ? 1 : 0);
+  StreamAreas::Put(out, value ? 1 : 0);
   return out;
 }
 OByteStream& operator<<(OByteStream& out, boost::logic::tribool value) {
-  out.Put(static_cast<unsigned char>(value.value));
+  StreamAreas::Put(out, static_cast<unsigned char>(value.value));
   return out;
 }
 OByteStream& operator<<(OByteStream& out, short value) {
@@ -180,23 +338,23 @@ OByteStream& operator<<(OByteStream& out, long double value) {
 }
 
 IByteStream& operator>>(IByteStream& in, char& value) {
-  value = static_cast<char>(in.Get());
+  value = static_cast<char>(StreamAreas::Get(in));
   return in;
 }
 IByteStream& operator>>(IByteStream& in, signed char& value) {
-  value = static_cast<signed char>(in.Get());
+  value = static_cast<signed char>(StreamAreas::Get(in));
   return in;
 }
 IByteStream& operator>>(IByteStream& in, unsigned char& value) {
-  value = in.Get();
+  value = StreamAreas::Get(in);
   return in;
 }
 IByteStream& operator>>(IByteStream& in, bool& value) {
-  value = in.Get() != 0;
+  value = StreamAreas::Get(in) != 0;
   return in;
 }
 IByteStream& operator>>(IByteStream& in, boost::logic::tribool& value) {
-  switch (in.Get()) {
+  switch (StreamAreas::Get(in)) {
     case 0:
       value = false;
       break;
@@ -210,36 +368,28 @@ IByteStream& operator>>(IByteStream& in, boost::logic::tribool& value) {
   return in;
 }
 IByteStream& operator>>(IByteStream& in, short& value) {
-  value = static_cast<short>(SignExtend<2>(GetBigEndian<2>(in)));
-  return in;
+  return Extract<2>(in, value);
 }
 IByteStream& operator>>(IByteStream& in, unsigned short& value) {
-  value = static_cast<unsigned short>(GetBigEndian<2>(in));
-  return in;
+  return Extract<2>(in, value);
 }
 IByteStream& operator>>(IByteStream& in, UTF16Char& value) {
-  value = static_cast<UTF16Char>(GetBigEndian<2>(in));
-  return in;
+  return Extract<2>(in, value);
 }
 IByteStream& operator>>(IByteStream& in, unsigned int& value) {
-  value = static_cast<unsigned int>(GetBigEndian<4>(in));
-  return in;
+  return Extract<4>(in, value);
 }
 IByteStream& operator>>(IByteStream& in, long& value) {
-  value = static_cast<long>(SignExtend<4>(GetBigEndian<4>(in)));
-  return in;
+  return Extract<4>(in, value);
 }
 IByteStream& operator>>(IByteStream& in, unsigned long& value) {
-  value = static_cast<unsigned long>(GetBigEndian<4>(in));
-  return in;
+  return Extract<4>(in, value);
 }
 IByteStream& operator>>(IByteStream& in, long long& value) {
-  value = static_cast<long long>(GetBigEndian<8>(in));
-  return in;
+  return Extract<8>(in, value);
 }
 IByteStream& operator>>(IByteStream& in, unsigned long long& value) {
-  value = GetBigEndian<8>(in);
-  return in;
+  return Extract<8>(in, value);
 }
 IByteStream& operator>>(IByteStream& in, std::string& value) {
   GetText(in, value);
@@ -275,16 +425,27 @@ OByteStream& operator<<(OByteStream& out, IByteStream& in) {
   if (length == 0) {
     // Only the input's end stops the copy; a full output still raises.
     for (;;) {
+      if (StreamAreas::CopyBetweenAreas(in, out, std::numeric_limits<std::uint64_t>::max()) != 0) {
+        continue;
+      }
       unsigned char byte;
       try {
-        byte = in.Get();
+        byte = StreamAreas::Get(in);
       } catch (const eof_error&) {
         return out;
       }
-      out.Put(byte);
+      StreamAreas::Put(out, byte);
     }
   }
-  for (unsigned long long i = 0; i < length; ++i) out.Put(in.Get());
+  for (unsigned long long remaining = length; remaining != 0;) {
+    const std::uint64_t moved = StreamAreas::CopyBetweenAreas(in, out, remaining);
+    if (moved != 0) {
+      remaining -= moved;
+    } else {
+      StreamAreas::Put(out, StreamAreas::Get(in));
+      --remaining;
+    }
+  }
   return out;
 }
 

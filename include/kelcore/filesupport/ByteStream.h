@@ -11,6 +11,20 @@
 // Streams are single-threaded objects with no locking; one thread at a time may use a
 // stream. xalloc may be called from any thread (the counter is atomic), but indices are
 // usually taken once at start-up. Streams are neither copyable nor movable.
+//
+// Destructors may throw: a stream that writes buffered data when it is destroyed lets an
+// error of its destination pass to the caller. (Such an error raised while the stack is
+// already being unwound for another exception ends the program, as always in C++.)
+//
+// Get and put areas. A stream whose next bytes sit in memory may expose them as a window
+// [gptr_, egptr_) of bytes that the next Gets would return, or [pptr_, epptr_) of slots
+// that the next Puts would fill, in the manner of std::streambuf. The typed operators
+// take bytes from, or store bytes into, such a window directly and advance the pointer,
+// and fall back to the virtual Get/Put for every byte that is not in the window. A stream
+// that exposes a window promises that this has exactly the effect of the same number of
+// Get (Put) calls; it accounts for the bytes moved through the window, by comparing the
+// pointer with where it put it, before any of its virtual operations does anything else.
+// Streams that do not expose a window (all pointers null) see one Get/Put per byte.
 #pragma once
 
 #include <cstdint>
@@ -20,6 +34,10 @@
 #include <kelcore/Export.h>
 
 namespace kelcore::filesupport {
+
+namespace detail {
+class StreamAreas;
+}
 
 class KELCORE_API ByteStream_base {
  public:
@@ -33,7 +51,7 @@ class KELCORE_API ByteStream_base {
 
   // Calls every registered callback, first registered first, as fn(kEraseEvent, *this,
   // index). Callbacks must not throw (a throwing callback ends the program).
-  virtual ~ByteStream_base();
+  virtual ~ByteStream_base() noexcept(false);
 
   // A process-wide index usable with iword/pword of any stream: 0 on the first call, then
   // 1, 2, ...
@@ -75,6 +93,14 @@ class KELCORE_API IByteStream : public ByteStream_base {
   virtual bool AtTheEnd() const;
   // The length in bytes; 0 means that the length is not known.
   virtual unsigned long long Length() const;
+
+ protected:
+  // The get area (see the top of this file); both null when the stream exposes none.
+  const unsigned char* gptr_ = nullptr;
+  const unsigned char* egptr_ = nullptr;
+
+ private:
+  friend class detail::StreamAreas;
 };
 
 // Base of every output stream.
@@ -96,6 +122,14 @@ class KELCORE_API OByteStream : public ByteStream_base {
   // on standard error and the process is aborted.
   virtual void OSFlush();
   virtual void Truncate(unsigned long long length);
+
+ protected:
+  // The put area (see the top of this file); both null when the stream exposes none.
+  unsigned char* pptr_ = nullptr;
+  unsigned char* epptr_ = nullptr;
+
+ private:
+  friend class detail::StreamAreas;
 };
 
 }  // namespace kelcore::filesupport
