@@ -36,6 +36,18 @@
 
 namespace kelcore::filesupport {
 
+// The system folders that the well-known directories are built on (see
+// DirHelper::SystemDir for where each lies).
+enum class SystemFolder {
+  kAppData,             // the user's application data (settings)
+  kDocuments,           // the user's documents
+  kDesktop,             // the user's desktop
+  kProgramFiles,        // where applications are installed
+  kProgramFilesCommon,  // where files shared by applications are installed
+  kCommonDocuments,     // documents shared by the family's applications
+  kTemp,                // the temporary folder
+};
+
 class KELCORE_API DirHelper {
  public:
   DirHelper() = default;
@@ -52,6 +64,25 @@ class KELCORE_API DirHelper {
   UTF16String FullNativePath() const;
 
   bool operator==(const DirHelper& other) const noexcept { return path_ == other.path_; }
+
+  // Where a system folder lies, computed afresh on every call; one trailing separator
+  // is removed. With `create` true a missing folder is created with every missing level
+  // above it. Returns an empty Dir when the folder cannot be had: the environment names
+  // no home directory, or the folder cannot be created when asked to be. Never throws
+  // (std::bad_alloc aside). On POSIX (XDG base directories and user dirs, FHS):
+  //   kAppData            $XDG_CONFIG_HOME, else $HOME/.config
+  //   kDocuments          XDG_DOCUMENTS_DIR of $XDG_CONFIG_HOME/user-dirs.dirs (the
+  //                       config folder as for kAppData), else $HOME/Documents
+  //   kDesktop            XDG_DESKTOP_DIR of the same file, else $HOME/Desktop
+  //   kProgramFiles       /opt
+  //   kProgramFilesCommon /opt/common
+  //   kCommonDocuments    $XDG_DATA_HOME/Varden/Shared, else
+  //                       $HOME/.local/share/Varden/Shared
+  //   kTemp               $TMPDIR, else /tmp
+  // An XDG variable counts only when it holds an absolute path; $TMPDIR counts when it
+  // is not empty. $HOME unset or empty falls back to the home directory of the user
+  // database entry of the process's real user.
+  static Dir SystemDir(SystemFolder id, bool create = false);
 
  private:
   UTF16String path_;
@@ -126,6 +157,45 @@ class KELCORE_API Dir {
   // An unreadable mount table gives an empty listing.
   static DirIterator BeginVolumes(const NameFilter& filter = NameFilter());
   static DirIterator EndVolumes() { return DirIterator(); }
+
+  // The well-known directories. Values that come from the system lose one trailing
+  // separator. Caches are unsynchronised process-wide values: the host sets overrides
+  // (<kelcore/filesupport/CommonDirs.h>) on its main thread at start-up, before other
+  // threads ask for directories.
+  //
+  // The application directory: the override path when set (commondirs::SetAppDirOverride
+  // or SetPackageDirOverride, which are one operation), else the folder of the process's
+  // executable (/proc/self/exe on Linux), computed on first use and kept. Throws
+  // dir_not_found_exception (with an empty Dir) when the executable's path cannot be
+  // read.
+  static Dir AppDir();
+  // The same as AppDir: the two can never differ.
+  static Dir PackageDir();
+  // The common program files folder (SystemFolder::kProgramFilesCommon); AppDir when it
+  // cannot be had.
+  static Dir CommonFilesDir();
+  // The family's shared folder inside the program files folder:
+  // SystemDir(kProgramFiles) + "Varden" + "Common" (/opt/Varden/Common); an empty Dir
+  // when the program files folder cannot be had. Not created.
+  static Dir GlobalCommonFilesDir();
+  // The user's application-data folder (SystemFolder::kAppData), created when missing;
+  // AppDir when it cannot be had or created.
+  static Dir GlobalPrefDir();
+  // The host's preferences directory. When config::GetClientPrefsDir() is not empty,
+  // the Dir of that path, created nowhere. Otherwise GlobalPrefDir + company name +
+  // client name + client internal version (config::GetCompanyName, GetClientName,
+  // GetClientInternalVersion), each level created when missing; a level that cannot
+  // be created throws dir_create_exception for that level. An empty name adds no
+  // level. Computed on every call.
+  static Dir PrefDir();
+  // The temporary folder (SystemFolder::kTemp). Not created.
+  static Dir TempDir();
+  // The user's documents folder, as commondirs::UserDocumentsDir (created when missing;
+  // throws dir_exception when it cannot be had).
+  static Dir UserDocsDir();
+  // The documents shared by the family's applications, as
+  // commondirs::AllUsersDocumentsDir (an empty Dir when it cannot be had).
+  static Dir SharedDocsDir();
 
   // Equality and order of the normalised paths, code unit by code unit.
   bool operator==(const Dir& other) const noexcept { return helper_ == other.helper_; }
