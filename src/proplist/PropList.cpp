@@ -8,7 +8,6 @@
 
 #include <kelcore/utility/StringStreams.h>
 #include <kelcore/utility/UnicodeConversion.h>
-#include <kelcore/xml/ReservedCharacters.h>
 
 #include <algorithm>
 #include <iterator>
@@ -69,7 +68,10 @@ const PropNodeBase* PropList::FindNode(KeyView key) const {
 }
 
 void PropList::Store(KeyView key, std::unique_ptr<PropNodeBase> node) {
-  const auto place = entries_.lower_bound(key);
+  // A list read from a document receives its keys in order: look at the end first.
+  const auto place = entries_.empty() || KeyView(entries_.rbegin()->first) < key
+                         ? entries_.end()
+                         : entries_.lower_bound(key);
   if (place != entries_.end() && KeyView(place->first) == key) {
     place->second = std::move(node);
   } else {
@@ -90,6 +92,11 @@ template <class Value>
 void PropList::SetTyped(const UTF8String& key, const Value& value) {
   using Node = NodeClassOf<Value>;
   const KeyView name = KeyOf(key);
+  // A new key after all others (a list read from a document) needs no search.
+  if (!entries_.empty() && KeyView(entries_.rbegin()->first) < name) {
+    entries_.emplace_hint(entries_.end(), UTF8String(name), std::make_unique<Node>(value));
+    return;
+  }
   if (PropNodeBase* node = const_cast<PropNodeBase*>(FindNode(name));
       node != nullptr && node->GetType() == Node::kType) {
     static_cast<Node*>(node)->Set(value);
@@ -261,7 +268,7 @@ void PropList::OutputAsXMLFragment(UTF8String& out) const {
   AppendAscii("<prop.list>\n", out);
   for (const auto& [key, node] : entries_) {
     AppendAscii("<prop.pair>\n<key>", out);
-    xml::utils::EncodeReservedCharacters(key, out);
+    AppendEscaped(key, out);
     AppendAscii("</key>\n", out);
     node->OutputAsXML(out);
     AppendAscii("</prop.pair>\n", out);

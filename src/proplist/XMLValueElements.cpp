@@ -1,9 +1,9 @@
 #include "XMLValueElements.h"
 
-#include <kelcore/utility/StringStreams.h>
 #include <kelcore/utility/UnicodeConversion.h>
 #include <kelcore/xml/ReservedCharacters.h>
 
+#include <algorithm>
 #include <charconv>
 
 namespace kelcore::proplist {
@@ -18,15 +18,18 @@ void AppendIntElement(std::string_view openTag, Integer value, UTF8String& out) 
   AppendAscii("</int>\n", out);
 }
 
+// The classic locale's general notation with `precision` significant digits, exactly
+// what a stream set to that precision writes (printf's "%.*g"), without the stream. A
+// float is widened first, as the stream widens it.
 template <class Real>
 void AppendRealElement(std::string_view name, Real value, int precision, UTF8String& out) {
-  utility::oUTF8StringStream text;
-  text.precision(precision);
-  text << value;
+  char digits[64];
+  const auto result = std::to_chars(digits, digits + sizeof digits, static_cast<double>(value),
+                                    std::chars_format::general, precision);
   out.push_back('<');
   AppendAscii(name, out);
   out.push_back('>');
-  out.append(text.str());
+  AppendAscii(std::string_view(digits, static_cast<std::size_t>(result.ptr - digits)), out);
   AppendAscii("</", out);
   AppendAscii(name, out);
   AppendAscii(">\n", out);
@@ -38,15 +41,26 @@ void AppendAscii(std::string_view text, UTF8String& out) {
   out.append(reinterpret_cast<const unsigned char*>(text.data()), text.size());
 }
 
+void AppendEscaped(const UTF8String& text, UTF8String& out) {
+  const auto reserved = [](unsigned char c) {
+    return c == '"' || c == '&' || c == '\'' || c == '<' || c == '>';
+  };
+  if (std::none_of(text.begin(), text.end(), reserved)) {
+    out.append(text);
+  } else {
+    xml::utils::EncodeReservedCharacters(text, out);
+  }
+}
+
 void AppendValueElement(const UTF16String& value, UTF8String& out) {
   AppendAscii("<ustring>", out);
-  xml::utils::EncodeReservedCharacters(utility::UTF16to8(value), out);
+  AppendEscaped(utility::UTF16to8(value), out);
   AppendAscii("</ustring>\n", out);
 }
 
 void AppendValueElement(const UTF8String& value, UTF8String& out) {
   AppendAscii("<string>", out);
-  xml::utils::EncodeReservedCharacters(value, out);
+  AppendEscaped(value, out);
   AppendAscii("</string>\n", out);
 }
 

@@ -17,6 +17,8 @@ namespace kelcore::proplist {
 
 // Appends 7-bit text unchanged.
 void AppendAscii(std::string_view text, UTF8String& out);
+// Appends `text` escaped for XML; text without reserved characters is copied at once.
+void AppendEscaped(const UTF8String& text, UTF8String& out);
 
 void AppendValueElement(const UTF16String& value, UTF8String& out);  // <ustring>, as UTF-8
 void AppendValueElement(const UTF8String& value, UTF8String& out);   // <string>

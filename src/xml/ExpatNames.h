@@ -24,8 +24,10 @@ class ExpatNames {
   // The separator Expat was created with.
   explicit ExpatNames(char separator) : separator_(separator) {}
 
-  // The parts of `name`. The reference stays valid until the next call.
+  // The parts of `name`. The reference stays valid until the next call, and for as long
+  // as this object lives when IsLasting(result) says so.
   const SplitName& Split(const char* name);
+  bool IsLasting(const SplitName& parts) const { return &parts != &unremembered_; }
 
  private:
   struct Hash {

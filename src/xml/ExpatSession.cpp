@@ -120,9 +120,11 @@ void ExpatSession::OnStartElement(void* self, const char* name, const char** att
       attribute.qualifiedName = parts.qualifiedName;
       attribute.namespaceURI = parts.namespaceURI;
       attribute.localName = parts.localName;
-      attribute.value = s.ToUTF16(attributes[2 * i + 1]);
+      const char* value = attributes[2 * i + 1];
+      s.AssignUTF16(value, std::strlen(value), attribute.value);
     }
     const SplitName& element = s.names_.Split(name);
+    s.openElements_.push_back(s.names_.IsLasting(element) ? &element : nullptr);
     s.handler_.StartElementWithNamespace(element.qualifiedName, element.namespaceURI,
                                          element.localName, s.attributes_);
   });
@@ -131,7 +133,12 @@ void ExpatSession::OnStartElement(void* self, const char* name, const char** att
 void ExpatSession::OnEndElement(void* self, const char* name) {
   Deliver(self, [name](ExpatSession& s) {
     s.FlushText();
-    const SplitName& element = s.names_.Split(name);
+    const SplitName* open = nullptr;
+    if (!s.openElements_.empty()) {
+      open = s.openElements_.back();
+      s.openElements_.pop_back();
+    }
+    const SplitName& element = open != nullptr ? *open : s.names_.Split(name);
     s.handler_.EndElementWithNamespace(element.qualifiedName, element.namespaceURI,
                                        element.localName);
   });
@@ -188,9 +195,24 @@ void ExpatSession::OnEndNamespace(void* self, const char* prefix) {
 
 void ExpatSession::FlushText() {
   if (pendingText_.empty()) return;
-  const UTF16String text = utility::UTF8to16(pendingText_);
+  AssignUTF16(reinterpret_cast<const char*>(pendingText_.data()), pendingText_.size(), text_);
   pendingText_.clear();
-  handler_.Characters(text);
+  handler_.Characters(text_);
+}
+
+void ExpatSession::AssignUTF16(const char* text, std::size_t length, UTF16String& out) {
+  // Most text of most documents is 7-bit: widen it in place.
+  const auto* bytes = reinterpret_cast<const unsigned char*>(text);
+  unsigned char high = 0;
+  for (std::size_t i = 0; i < length; ++i) high |= bytes[i];
+  if (high < 0x80) {
+    out.resize(length);
+    UTF16Char* units = out.data();
+    for (std::size_t i = 0; i < length; ++i) units[i] = static_cast<UTF16Char>(bytes[i]);
+    return;
+  }
+  scratch_.assign(bytes, length);
+  out = utility::UTF8to16(scratch_);
 }
 
 UTF16String ExpatSession::ToUTF16(const char* text, std::size_t length) {

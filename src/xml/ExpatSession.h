@@ -5,6 +5,7 @@
 
 #include <cstddef>
 #include <exception>
+#include <vector>
 
 #include <kelcore/utility/StringTypes.h>
 #include <kelcore/xml/AbstractParseHandler.h>
@@ -61,12 +62,19 @@ class ExpatSession {
   void FlushText();
   UTF16String ToUTF16(const char* text, std::size_t length);
   UTF16String ToUTF16(const char* text);
+  // Replaces `out` with `length` bytes of UTF-8 `text` in UTF-16, as UTF8to16 converts
+  // them, keeping `out`'s capacity.
+  void AssignUTF16(const char* text, std::size_t length, UTF16String& out);
 
   AbstractParseHandler& handler_;
   XML_ParserStruct* parser_ = nullptr;
   std::exception_ptr handlerFailure_;
   UTF8String pendingText_;  // adjacent character data not yet delivered
+  UTF16String text_;        // the text delivered last, kept for its capacity
   UTF8String scratch_;      // reused for conversions
+  // The names of the open elements, innermost last, so that an element's end needs no
+  // second look-up; null for a name that ExpatNames does not keep.
+  std::vector<const SplitName*> openElements_;
   ExpatNames names_;
   // Reused from element to element, so that the strings keep their capacity.
   AttributeVector attributes_;
