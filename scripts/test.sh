@@ -20,7 +20,6 @@ run_suite() {
 }
 
 run_suite build/test -DCMAKE_BUILD_TYPE=RelWithDebInfo
-run_suite build/test-asan -DCMAKE_BUILD_TYPE=Debug -DCMAKE_CXX_FLAGS_DEBUG="-g -O1" -DKELCORE_SANITIZE=address,undefined \
-  -DKELCORE_BUILD_APPS=OFF
+run_suite build/test-asan -DCMAKE_BUILD_TYPE=Debug -DCMAKE_CXX_FLAGS_DEBUG="-g -O1" -DKELCORE_SANITIZE=address,undefined
 run_suite build/test-tsan -DCMAKE_BUILD_TYPE=Debug -DCMAKE_CXX_FLAGS_DEBUG="-g -O1" -DKELCORE_SANITIZE=thread \
   -DKELCORE_BUILD_APPS=OFF
