@@ -10,7 +10,7 @@ packages=(
   libgtest-dev libgmock-dev
 )
 if [[ "${1:-}" == "--bench" ]]; then
-  packages+=(libbenchmark-dev libmimalloc-dev libjemalloc-dev libtbb-dev)
+  packages+=(libbenchmark-dev libmimalloc-dev libjemalloc-dev libtbb-dev nlohmann-json3-dev rapidjson-dev)
 fi
 
 missing=()
