@@ -2,14 +2,11 @@
 
 #include <algorithm>
 #include <charconv>
-#include <climits>
 #include <cstddef>
 #include <cstdint>
 #include <cstring>
 #include <limits>
 #include <stdexcept>
-#include <type_traits>
-#include <utility>
 
 namespace kelcore::filesupport {
 namespace detail {
@@ -34,13 +31,6 @@ class StreamAreas {
     } else {
       out.Put(byte);
     }
-  }
-
-  // The next `count` bytes of the get area, consumed; the area must hold them.
-  static const unsigned char* Take(IByteStream& in, std::size_t count) {
-    const unsigned char* const bytes = in.gptr_;
-    in.gptr_ += count;
-    return bytes;
   }
 
   // Stores `count` bytes. The common case, all of them in the area, stays small enough to
@@ -113,73 +103,37 @@ class StreamAreas {
   }
 };
 
+namespace {
+
+void CheckFieldWidth(std::size_t width) {
+  if (width == 0 || width > sizeof(std::uint64_t)) {
+    throw std::invalid_argument("byte stream field: the width must be in [1, 8]");
+  }
+}
+
+}  // namespace
+
+std::uint64_t GetFieldAcrossArea(IByteStream& in, std::size_t width) {
+  CheckFieldWidth(width);
+  unsigned char bytes[sizeof(std::uint64_t)];
+  StreamAreas::GetAcrossArea(in, bytes, width);
+  std::uint64_t field = 0;
+  for (std::size_t i = 0; i < width; ++i) field = field << 8 | bytes[i];
+  return field;
+}
+
+void PutFieldAcrossArea(OByteStream& out, std::uint64_t field, std::size_t width) {
+  CheckFieldWidth(width);
+  unsigned char bytes[sizeof(std::uint64_t)];
+  for (std::size_t i = width; i-- != 0; field >>= 8) bytes[i] = static_cast<unsigned char>(field);
+  StreamAreas::PutAcrossArea(out, bytes, width);
+}
+
 }  // namespace detail
 
 namespace {
 
 using detail::StreamAreas;
-
-template <int Bytes>
-void PutBigEndian(OByteStream& out, std::uint64_t value) {
-  unsigned char bytes[Bytes];
-  for (int i = 0; i < Bytes; ++i) {
-    bytes[i] = static_cast<unsigned char>(value >> ((Bytes - 1 - i) * 8));
-  }
-  StreamAreas::Put(out, bytes, Bytes);
-}
-
-// Written out as one expression, which compilers turn into a load and a byte swap.
-template <std::size_t... I>
-std::uint64_t FromBigEndian(const unsigned char* bytes, std::index_sequence<I...>) {
-  constexpr std::size_t kLast = sizeof...(I) - 1;
-  return ((std::uint64_t{bytes[I]} << (8 * (kLast - I))) | ...);
-}
-
-// Sign-extends the low `Bytes` bytes of `raw`.
-template <int Bytes>
-std::int64_t SignExtend(std::uint64_t raw) {
-  constexpr int kUnused = 64 - Bytes * 8;
-  return static_cast<std::int64_t>(raw << kUnused) >> kUnused;
-}
-
-// A field's value as the type it is read into: sign-extended for signed types.
-template <typename T, int Bytes>
-T FromField(std::uint64_t raw) {
-  if constexpr (std::is_signed_v<T>) {
-    return static_cast<T>(SignExtend<Bytes>(raw));
-  } else {
-    return static_cast<T>(raw);
-  }
-}
-
-template <int Bytes>
-[[gnu::noinline]] std::uint64_t GetBigEndianAcrossArea(IByteStream& in) {
-  unsigned char bytes[Bytes];
-  StreamAreas::GetAcrossArea(in, bytes, Bytes);
-  return FromBigEndian(bytes, std::make_index_sequence<Bytes>());
-}
-
-template <int Bytes>
-std::uint64_t GetBigEndian(IByteStream& in) {
-  if (StreamAreas::Readable(in) < Bytes) return GetBigEndianAcrossArea<Bytes>(in);
-  return FromBigEndian(StreamAreas::Take(in, Bytes), std::make_index_sequence<Bytes>());
-}
-
-template <int Bytes, typename T>
-[[gnu::noinline]] IByteStream& ExtractAcrossArea(IByteStream& in, T& value) {
-  value = FromField<T, Bytes>(GetBigEndianAcrossArea<Bytes>(in));
-  return in;
-}
-
-// Reads a big-endian field into `value`. The common case, the whole field in the get
-// area, is a load and a byte swap; the rest leaves by a tail call.
-template <int Bytes, typename T>
-IByteStream& Extract(IByteStream& in, T& value) {
-  if (StreamAreas::Readable(in) < Bytes) return ExtractAcrossArea<Bytes>(in, value);
-  value = FromField<T, Bytes>(
-      FromBigEndian(StreamAreas::Take(in, Bytes), std::make_index_sequence<Bytes>()));
-  return in;
-}
 
 // A corrupt length may ask for more than a string can hold.
 template <typename Text>
@@ -190,14 +144,14 @@ void AppendUnit(Text& text, typename Text::value_type unit) {
 
 template <typename Text>
 void PutText(OByteStream& out, const Text& text) {
-  PutBigEndian<8>(out, text.size());
+  detail::PutField<8>(out, text.size());
   StreamAreas::Put(out, reinterpret_cast<const unsigned char*>(text.data()), text.size());
 }
 
 template <typename Text>
 void GetText(IByteStream& in, Text& text) {
   text.clear();
-  std::uint64_t remaining = GetBigEndian<8>(in);
+  std::uint64_t remaining = detail::GetField<8>(in);
   while (remaining != 0) {
     const std::size_t taken = StreamAreas::AppendFromArea(in, text, remaining);
     if (taken != 0) {
@@ -217,7 +171,7 @@ void PutFloat(OByteStream& out, Float value) {
   const auto result =
       std::to_chars(text, text + sizeof text, value, std::chars_format::general, 36);
   const auto length = static_cast<std::size_t>(result.ptr - text);
-  PutBigEndian<8>(out, length);
+  detail::PutField<8>(out, length);
   StreamAreas::Put(out, reinterpret_cast<const unsigned char*>(text), length);
 }
 
@@ -240,77 +194,8 @@ void GetFloat(IByteStream& in, Float& value) {
   if (result.ec == std::errc{}) value = parsed;
 }
 
-// Where long is wider than its 32-bit field, values outside the field are refused.
-void CheckLongWidth(long value) {
-  if constexpr (sizeof(long) > 4) {
-    const auto wide = static_cast<long long>(value);
-    if (wide < INT32_MIN || wide > INT32_MAX) throw value_width_error();
-  }
-}
-
-void CheckLongWidth(unsigned long value) {
-  if constexpr (sizeof(unsigned long) > 4) {
-    if (static_cast<unsigned long long>(value) > UINT32_MAX) throw value_width_error();
-  }
-}
-
 }  // namespace
 
-OByteStream& operator<<(OByteStream& out, char value) {
-  StreamAreas::Put(out, static_cast<unsigned char>(value));
-  return out;
-}
-OByteStream& operator<<(OByteStream& out, signed char value) {
-  StreamAreas::Put(out, static_cast<unsigned char>(value));
-  return out;
-}
-OByteStream& operator<<(OByteStream& out, unsigned char value) {
-  StreamAreas::Put(out, value);
-  return out;
-}
-OByteStream& operator<<(OByteStream& out, bool value) {
-  StreamAreas::Put(out, value ? 1 : 0);
-  return out;
-}
-OByteStream& operator<<(OByteStream& out, boost::logic::tribool value) {
-  StreamAreas::Put(out, static_cast<unsigned char>(value.value));
-  return out;
-}
-OByteStream& operator<<(OByteStream& out, short value) {
-  PutBigEndian<2>(out, static_cast<std::uint16_t>(value));
-  return out;
-}
-OByteStream& operator<<(OByteStream& out, unsigned short value) {
-  PutBigEndian<2>(out, value);
-  return out;
-}
-OByteStream& operator<<(OByteStream& out, UTF16Char value) {
-  PutBigEndian<2>(out, static_cast<std::uint16_t>(value));
-  return out;
-}
-OByteStream& operator<<(OByteStream& out, unsigned int value) {
-  static_assert(sizeof(unsigned int) == 4, "unsigned int is the 32-bit field");
-  PutBigEndian<4>(out, value);
-  return out;
-}
-OByteStream& operator<<(OByteStream& out, long value) {
-  CheckLongWidth(value);
-  PutBigEndian<4>(out, static_cast<std::uint32_t>(value));
-  return out;
-}
-OByteStream& operator<<(OByteStream& out, unsigned long value) {
-  CheckLongWidth(value);
-  PutBigEndian<4>(out, value);
-  return out;
-}
-OByteStream& operator<<(OByteStream& out, long long value) {
-  PutBigEndian<8>(out, static_cast<std::uint64_t>(value));
-  return out;
-}
-OByteStream& operator<<(OByteStream& out, unsigned long long value) {
-  PutBigEndian<8>(out, value);
-  return out;
-}
 OByteStream& operator<<(OByteStream& out, const std::string& value) {
   PutText(out, value);
   return out;
@@ -320,8 +205,8 @@ OByteStream& operator<<(OByteStream& out, const UTF8String& value) {
   return out;
 }
 OByteStream& operator<<(OByteStream& out, const UTF16String& value) {
-  PutBigEndian<8>(out, value.size());
-  for (const UTF16Char unit : value) PutBigEndian<2>(out, static_cast<std::uint16_t>(unit));
+  detail::PutField<8>(out, value.size());
+  for (const UTF16Char unit : value) detail::PutField<2>(out, static_cast<std::uint16_t>(unit));
   return out;
 }
 OByteStream& operator<<(OByteStream& out, float value) {
@@ -337,60 +222,6 @@ OByteStream& operator<<(OByteStream& out, long double value) {
   return out;
 }
 
-IByteStream& operator>>(IByteStream& in, char& value) {
-  value = static_cast<char>(StreamAreas::Get(in));
-  return in;
-}
-IByteStream& operator>>(IByteStream& in, signed char& value) {
-  value = static_cast<signed char>(StreamAreas::Get(in));
-  return in;
-}
-IByteStream& operator>>(IByteStream& in, unsigned char& value) {
-  value = StreamAreas::Get(in);
-  return in;
-}
-IByteStream& operator>>(IByteStream& in, bool& value) {
-  value = StreamAreas::Get(in) != 0;
-  return in;
-}
-IByteStream& operator>>(IByteStream& in, boost::logic::tribool& value) {
-  switch (StreamAreas::Get(in)) {
-    case 0:
-      value = false;
-      break;
-    case 1:
-      value = true;
-      break;
-    default:
-      value = boost::logic::indeterminate;
-      break;
-  }
-  return in;
-}
-IByteStream& operator>>(IByteStream& in, short& value) {
-  return Extract<2>(in, value);
-}
-IByteStream& operator>>(IByteStream& in, unsigned short& value) {
-  return Extract<2>(in, value);
-}
-IByteStream& operator>>(IByteStream& in, UTF16Char& value) {
-  return Extract<2>(in, value);
-}
-IByteStream& operator>>(IByteStream& in, unsigned int& value) {
-  return Extract<4>(in, value);
-}
-IByteStream& operator>>(IByteStream& in, long& value) {
-  return Extract<4>(in, value);
-}
-IByteStream& operator>>(IByteStream& in, unsigned long& value) {
-  return Extract<4>(in, value);
-}
-IByteStream& operator>>(IByteStream& in, long long& value) {
-  return Extract<8>(in, value);
-}
-IByteStream& operator>>(IByteStream& in, unsigned long long& value) {
-  return Extract<8>(in, value);
-}
 IByteStream& operator>>(IByteStream& in, std::string& value) {
   GetText(in, value);
   return in;
@@ -401,9 +232,9 @@ IByteStream& operator>>(IByteStream& in, UTF8String& value) {
 }
 IByteStream& operator>>(IByteStream& in, UTF16String& value) {
   value.clear();
-  const std::uint64_t length = GetBigEndian<8>(in);
+  const std::uint64_t length = detail::GetField<8>(in);
   for (std::uint64_t i = 0; i < length; ++i) {
-    AppendUnit(value, static_cast<UTF16Char>(GetBigEndian<2>(in)));
+    AppendUnit(value, static_cast<UTF16Char>(detail::GetField<2>(in)));
   }
   return in;
 }

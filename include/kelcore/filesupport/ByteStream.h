@@ -25,8 +25,12 @@
 // Get (Put) calls; it accounts for the bytes moved through the window, by comparing the
 // pointer with where it put it, before any of its virtual operations does anything else.
 // Streams that do not expose a window (all pointers null) see one Get/Put per byte.
+// TakeFromGetArea and TakeFromPutArea hand the window to code outside the stream (the
+// inline typed operators, or a caller's own fixed-width fields) under the same promise:
+// taking n bytes has the effect of n Gets (Puts).
 #pragma once
 
+#include <cstddef>
 #include <cstdint>
 #include <utility>
 #include <vector>
@@ -94,6 +98,17 @@ class KELCORE_API IByteStream : public ByteStream_base {
   // The length in bytes; 0 means that the length is not known.
   virtual unsigned long long Length() const;
 
+  // The next `count` bytes (count >= 1) when the get area holds them all: they are consumed
+  // as `count` Gets would consume them, and stay valid until the next call on the stream.
+  // Null, with nothing consumed, when the area holds fewer (or the stream exposes none);
+  // the caller then reads them with Get.
+  const unsigned char* TakeFromGetArea(std::size_t count) noexcept {
+    if (static_cast<std::size_t>(egptr_ - gptr_) < count) return nullptr;
+    const unsigned char* const bytes = gptr_;
+    gptr_ += count;
+    return bytes;
+  }
+
  protected:
   // The get area (see the top of this file); both null when the stream exposes none.
   const unsigned char* gptr_ = nullptr;
@@ -122,6 +137,17 @@ class KELCORE_API OByteStream : public ByteStream_base {
   // on standard error and the process is aborted.
   virtual void OSFlush();
   virtual void Truncate(unsigned long long length);
+
+  // The next `count` slots (count >= 1) when the put area holds them all: they count as
+  // written by `count` Puts, so the caller must fill every one of them before its next
+  // call on the stream. Null, with nothing taken, when the area holds fewer (or the stream
+  // exposes none); the caller then writes the bytes with Put.
+  unsigned char* TakeFromPutArea(std::size_t count) noexcept {
+    if (static_cast<std::size_t>(epptr_ - pptr_) < count) return nullptr;
+    unsigned char* const slots = pptr_;
+    pptr_ += count;
+    return slots;
+  }
 
  protected:
   // The put area (see the top of this file); both null when the stream exposes none.

@@ -37,7 +37,10 @@
 // Each operator returns its stream so that calls chain.
 #pragma once
 
+#include <cstddef>
+#include <cstdint>
 #include <string>
+#include <utility>
 
 #include <boost/logic/tribool.hpp>
 
@@ -48,47 +51,201 @@
 
 namespace kelcore::filesupport {
 
-KELCORE_API OByteStream& operator<<(OByteStream& out, char value);
-KELCORE_API OByteStream& operator<<(OByteStream& out, signed char value);
-KELCORE_API OByteStream& operator<<(OByteStream& out, unsigned char value);
-KELCORE_API OByteStream& operator<<(OByteStream& out, bool value);
-KELCORE_API OByteStream& operator<<(OByteStream& out, boost::logic::tribool value);
-KELCORE_API OByteStream& operator<<(OByteStream& out, short value);
-KELCORE_API OByteStream& operator<<(OByteStream& out, unsigned short value);
-KELCORE_API OByteStream& operator<<(OByteStream& out, UTF16Char value);
-KELCORE_API OByteStream& operator<<(OByteStream& out, unsigned int value);
-KELCORE_API OByteStream& operator<<(OByteStream& out, long value);
-KELCORE_API OByteStream& operator<<(OByteStream& out, unsigned long value);
-KELCORE_API OByteStream& operator<<(OByteStream& out, long long value);
-KELCORE_API OByteStream& operator<<(OByteStream& out, unsigned long long value);
+// The fixed-width fields (every integer type, bool, tribool) are inline. When the stream's
+// window (ByteStream.h) holds the whole field, the operator loads or stores it there and
+// moves the pointer; otherwise it calls the out-of-line half below, which takes the bytes
+// that are in the window and makes one Get/Put call for each of the others. Either way the
+// result, the stream's state and the exceptions are those of one Get/Put per byte.
+namespace detail {
+
+// The `width`-byte big-endian field (1 <= width <= 8) moved byte by byte as described
+// above; GetFieldAcrossArea returns it zero-extended, PutFieldAcrossArea writes the low
+// `width` bytes of `field`. A width outside [1, 8] raises std::invalid_argument.
+KELCORE_API std::uint64_t GetFieldAcrossArea(IByteStream& in, std::size_t width);
+KELCORE_API void PutFieldAcrossArea(OByteStream& out, std::uint64_t field, std::size_t width);
+
+// Byte-wise expressions that do not depend on the host's byte order; compilers turn them
+// into one load or store and a byte swap.
+template <std::size_t... I>
+constexpr std::uint64_t LoadBigEndian(const unsigned char* bytes,
+                                      std::index_sequence<I...>) noexcept {
+  constexpr std::size_t kLast = sizeof...(I) - 1;
+  return ((std::uint64_t{bytes[I]} << (8 * (kLast - I))) | ...);
+}
+
+template <std::size_t... I>
+constexpr void StoreBigEndian(unsigned char* bytes, std::uint64_t field,
+                              std::index_sequence<I...>) noexcept {
+  constexpr std::size_t kLast = sizeof...(I) - 1;
+  ((bytes[I] = static_cast<unsigned char>(field >> (8 * (kLast - I)))), ...);
+}
+
+template <std::size_t Width>
+std::uint64_t GetField(IByteStream& in) {
+  if (const unsigned char* bytes = in.TakeFromGetArea(Width)) {
+    return LoadBigEndian(bytes, std::make_index_sequence<Width>());
+  }
+  return GetFieldAcrossArea(in, Width);
+}
+
+template <std::size_t Width>
+void PutField(OByteStream& out, std::uint64_t field) {
+  if (unsigned char* slots = out.TakeFromPutArea(Width)) {
+    StoreBigEndian(slots, field, std::make_index_sequence<Width>());
+  } else {
+    PutFieldAcrossArea(out, field, Width);
+  }
+}
+
+// Where long is wider than its 32-bit field, values outside the field are refused.
+inline void CheckLongWidth(long value) {
+  if constexpr (sizeof(long) > 4) {
+    if (value < INT32_MIN || value > INT32_MAX) throw value_width_error();
+  }
+}
+
+inline void CheckLongWidth(unsigned long value) {
+  if constexpr (sizeof(unsigned long) > 4) {
+    if (value > UINT32_MAX) throw value_width_error();
+  }
+}
+
+}  // namespace detail
+
+inline OByteStream& operator<<(OByteStream& out, char value) {
+  detail::PutField<1>(out, static_cast<unsigned char>(value));
+  return out;
+}
+inline OByteStream& operator<<(OByteStream& out, signed char value) {
+  detail::PutField<1>(out, static_cast<unsigned char>(value));
+  return out;
+}
+inline OByteStream& operator<<(OByteStream& out, unsigned char value) {
+  detail::PutField<1>(out, value);
+  return out;
+}
+inline OByteStream& operator<<(OByteStream& out, bool value) {
+  detail::PutField<1>(out, value ? 1 : 0);
+  return out;
+}
+inline OByteStream& operator<<(OByteStream& out, boost::logic::tribool value) {
+  detail::PutField<1>(out, static_cast<unsigned char>(value.value));
+  return out;
+}
+inline OByteStream& operator<<(OByteStream& out, short value) {
+  detail::PutField<2>(out, static_cast<std::uint16_t>(value));
+  return out;
+}
+inline OByteStream& operator<<(OByteStream& out, unsigned short value) {
+  detail::PutField<2>(out, value);
+  return out;
+}
+inline OByteStream& operator<<(OByteStream& out, UTF16Char value) {
+  detail::PutField<2>(out, static_cast<std::uint16_t>(value));
+  return out;
+}
+inline OByteStream& operator<<(OByteStream& out, unsigned int value) {
+  static_assert(sizeof(unsigned int) == 4, "unsigned int is the 32-bit field");
+  detail::PutField<4>(out, value);
+  return out;
+}
+inline OByteStream& operator<<(OByteStream& out, long value) {
+  detail::CheckLongWidth(value);
+  detail::PutField<4>(out, static_cast<std::uint32_t>(value));
+  return out;
+}
+inline OByteStream& operator<<(OByteStream& out, unsigned long value) {
+  detail::CheckLongWidth(value);
+  detail::PutField<4>(out, value);
+  return out;
+}
+inline OByteStream& operator<<(OByteStream& out, long long value) {
+  detail::PutField<8>(out, static_cast<std::uint64_t>(value));
+  return out;
+}
+inline OByteStream& operator<<(OByteStream& out, unsigned long long value) {
+  detail::PutField<8>(out, value);
+  return out;
+}
+OByteStream& operator<<(OByteStream& out, int value) = delete;
+
+inline IByteStream& operator>>(IByteStream& in, char& value) {
+  value = static_cast<char>(detail::GetField<1>(in));
+  return in;
+}
+inline IByteStream& operator>>(IByteStream& in, signed char& value) {
+  value = static_cast<signed char>(detail::GetField<1>(in));
+  return in;
+}
+inline IByteStream& operator>>(IByteStream& in, unsigned char& value) {
+  value = static_cast<unsigned char>(detail::GetField<1>(in));
+  return in;
+}
+inline IByteStream& operator>>(IByteStream& in, bool& value) {
+  value = detail::GetField<1>(in) != 0;
+  return in;
+}
+inline IByteStream& operator>>(IByteStream& in, boost::logic::tribool& value) {
+  switch (detail::GetField<1>(in)) {
+    case 0:
+      value = false;
+      break;
+    case 1:
+      value = true;
+      break;
+    default:
+      value = boost::logic::indeterminate;
+      break;
+  }
+  return in;
+}
+inline IByteStream& operator>>(IByteStream& in, short& value) {
+  value = static_cast<short>(detail::GetField<2>(in));
+  return in;
+}
+inline IByteStream& operator>>(IByteStream& in, unsigned short& value) {
+  value = static_cast<unsigned short>(detail::GetField<2>(in));
+  return in;
+}
+inline IByteStream& operator>>(IByteStream& in, UTF16Char& value) {
+  value = static_cast<UTF16Char>(detail::GetField<2>(in));
+  return in;
+}
+inline IByteStream& operator>>(IByteStream& in, unsigned int& value) {
+  value = static_cast<unsigned int>(detail::GetField<4>(in));
+  return in;
+}
+inline IByteStream& operator>>(IByteStream& in, long& value) {
+  value = static_cast<std::int32_t>(detail::GetField<4>(in));
+  return in;
+}
+inline IByteStream& operator>>(IByteStream& in, unsigned long& value) {
+  value = static_cast<std::uint32_t>(detail::GetField<4>(in));
+  return in;
+}
+inline IByteStream& operator>>(IByteStream& in, long long& value) {
+  value = static_cast<long long>(detail::GetField<8>(in));
+  return in;
+}
+inline IByteStream& operator>>(IByteStream& in, unsigned long long& value) {
+  value = detail::GetField<8>(in);
+  return in;
+}
+IByteStream& operator>>(IByteStream& in, int& value) = delete;
+
 KELCORE_API OByteStream& operator<<(OByteStream& out, const std::string& value);
 KELCORE_API OByteStream& operator<<(OByteStream& out, const UTF8String& value);
 KELCORE_API OByteStream& operator<<(OByteStream& out, const UTF16String& value);
 KELCORE_API OByteStream& operator<<(OByteStream& out, float value);
 KELCORE_API OByteStream& operator<<(OByteStream& out, double value);
 KELCORE_API OByteStream& operator<<(OByteStream& out, long double value);
-OByteStream& operator<<(OByteStream& out, int value) = delete;
 
-KELCORE_API IByteStream& operator>>(IByteStream& in, char& value);
-KELCORE_API IByteStream& operator>>(IByteStream& in, signed char& value);
-KELCORE_API IByteStream& operator>>(IByteStream& in, unsigned char& value);
-KELCORE_API IByteStream& operator>>(IByteStream& in, bool& value);
-KELCORE_API IByteStream& operator>>(IByteStream& in, boost::logic::tribool& value);
-KELCORE_API IByteStream& operator>>(IByteStream& in, short& value);
-KELCORE_API IByteStream& operator>>(IByteStream& in, unsigned short& value);
-KELCORE_API IByteStream& operator>>(IByteStream& in, UTF16Char& value);
-KELCORE_API IByteStream& operator>>(IByteStream& in, unsigned int& value);
-KELCORE_API IByteStream& operator>>(IByteStream& in, long& value);
-KELCORE_API IByteStream& operator>>(IByteStream& in, unsigned long& value);
-KELCORE_API IByteStream& operator>>(IByteStream& in, long long& value);
-KELCORE_API IByteStream& operator>>(IByteStream& in, unsigned long long& value);
 KELCORE_API IByteStream& operator>>(IByteStream& in, std::string& value);
 KELCORE_API IByteStream& operator>>(IByteStream& in, UTF8String& value);
 KELCORE_API IByteStream& operator>>(IByteStream& in, UTF16String& value);
 KELCORE_API IByteStream& operator>>(IByteStream& in, float& value);
 KELCORE_API IByteStream& operator>>(IByteStream& in, double& value);
 KELCORE_API IByteStream& operator>>(IByteStream& in, long double& value);
-IByteStream& operator>>(IByteStream& in, int& value) = delete;
 
 // Copies `in` into `out` from the input's current position, one Get and one Put per byte.
 // When in.Length() is 0 (unknown) it copies until the input raises eof_error, which ends
