@@ -10,6 +10,7 @@
 #include <kelcore/xml/DefaultParserFactory.h>
 #include <kelcore/xml/ParserFactorySlot.h>
 
+#include "DataCommands.h"
 #include "HostCommands.h"
 
 namespace kelcon {
@@ -39,6 +40,7 @@ HostSession::HostSession(const HostOptions& options) {
 
   console::Initialize();
   RegisterHostCommands();
+  RegisterDataCommands();
 
   if (options.openLogFile) console::ConsoleLogFile::GetInstance().OpenDefaultLogFile(true);
   traceHandlers_.emplace();
@@ -49,6 +51,7 @@ HostSession::~HostSession() {
   traceHandlers_.reset();
   debug::ShutdownTraceManager();
   console::ConsoleLogFile::Terminate();
+  UnregisterDataCommands();
   UnregisterHostCommands();
   console::Terminate();
   xml::SetParserFactory(nullptr);

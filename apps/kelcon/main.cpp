@@ -52,6 +52,9 @@ constexpr const char* kUsage =
     "  plist.set FILE KEY TYPE VALUE   set a value in a property list file (made if\n"
     "                                  missing); TYPE is ustring, string, bool, uint16,\n"
     "                                  uint32, int32, int64, uint64, float or double\n"
+    "  json.check FILE                 parse a JSON file, report its shape or the error\n"
+    "  json.format FILE                print a JSON file in compact form\n"
+    "  guid.new                        print a new unique GUID\n"
     "\n"
     "Exit status: 0 when every command ran, 1 when a command was unknown or failed,\n"
     "2 for a usage error.\n";

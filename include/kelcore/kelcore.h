@@ -42,6 +42,7 @@
 #include <kelcore/filesupport/FileExceptions.h>
 #include <kelcore/filesupport/FileNames.h>
 #include <kelcore/filesupport/FileUtils.h>
+#include <kelcore/filesupport/MemoryMappedFile.h>
 #include <kelcore/filesupport/PathStrings.h>
 #include <kelcore/filesupport/PathUtils.h>
 #include <kelcore/filesupport/PlatformByteStream.h>
@@ -56,6 +57,10 @@
 #include <kelcore/proplist/PropListUtils.h>
 #include <kelcore/proplist/PropListXMLHandler.h>
 #include <kelcore/proplist/PropNodeBase.h>
+#include <kelcore/serialization/JSONAccess.h>
+#include <kelcore/serialization/JSONParse.h>
+#include <kelcore/serialization/JSONValue.h>
+#include <kelcore/serialization/JSONWriter.h>
 #include <kelcore/threads/AsyncExecutor.h>
 #include <kelcore/threads/ConditionVariable.h>
 #include <kelcore/threads/EventLoopAdaptor.h>
@@ -72,7 +77,9 @@
 #include <kelcore/utility/CaseMapping.h>
 #include <kelcore/utility/Flags.h>
 #include <kelcore/utility/Geometry.h>
+#include <kelcore/utility/Guid.h>
 #include <kelcore/utility/HashValue.h>
+#include <kelcore/utility/HighPrecisionTime.h>
 #include <kelcore/utility/LineEndings.h>
 #include <kelcore/utility/Locale.h>
 #include <kelcore/utility/LocaleSeparators.h>

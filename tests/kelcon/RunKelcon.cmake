@@ -74,7 +74,25 @@ if(NOT logs)
   message(FATAL_ERROR "no log file in ${prefs}/logs")
 endif()
 
-# 4. Usage.
+# 4. JSON and GUID commands.
+file(WRITE "${WORK_DIR}/doc.json" "{ \"b\": [1, 2.5, null, true], \"a\": \"x\" } trailing")
+file(WRITE "${WORK_DIR}/bad.json" "{\"a\":")
+file(WRITE "${WORK_DIR}/data.txt" "json.check ${WORK_DIR}/doc.json
+json.format ${WORK_DIR}/doc.json
+guid.new
+json.check ${WORK_DIR}/bad.json
+")
+execute_process(COMMAND "${KELCON}" --prefs "${prefs}" --no-log "${WORK_DIR}/data.txt"
+                OUTPUT_VARIABLE out ERROR_VARIABLE err RESULT_VARIABLE rc)
+expect_match("${out}" "valid JSON: an object with 2 members" "json.check")
+expect_match("${out}" "\\{\"a\":\"x\",\"b\":\\[1,2\\.5,null,true\\]\\}" "json.format")
+expect_match("${out}" "[0-9a-f]+-[0-9a-f]+-4[0-9a-f]+-[0-9a-f]+-[0-9a-f]+" "guid.new")
+expect_match("${err}" "ParseObject unexpected char" "json.check error")
+if(NOT rc EQUAL 1)
+  message(FATAL_ERROR "a failed json.check must make the script exit 1, got ${rc}")
+endif()
+
+# 5. Usage.
 execute_process(COMMAND "${KELCON}" --help OUTPUT_VARIABLE out RESULT_VARIABLE rc)
 expect_match("${out}" "Usage: kelcon" "--help")
 execute_process(COMMAND "${KELCON}" --bogus ERROR_VARIABLE err RESULT_VARIABLE rc)
