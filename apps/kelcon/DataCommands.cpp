@@ -2,6 +2,7 @@
 
 #include <kelcore/console/Command.h>
 #include <kelcore/console/CommandRegistry.h>
+#include <kelcore/debug/CodeProfiler.h>
 #include <kelcore/filesupport/File.h>
 #include <kelcore/filesupport/FileUtils.h>
 #include <kelcore/serialization/JSONParse.h>
@@ -79,6 +80,19 @@ class GuidNew : public Command {
   }
 };
 
+class ProfileDump : public Command {
+ public:
+  using Command::Command;
+  void Execute(const UTF16String&, UTF16OutputStream& out) override {
+    bool any = false;
+    kelcore::debug::CodeProfilerManager::Get().DumpProfilingData([&](const std::string& line) {
+      out << line << kelcore::console::endl;
+      any = true;
+    });
+    if (!any) out << "No profiling data." << kelcore::console::endl;
+  }
+};
+
 template <typename T>
 Command* Make(const UTF16String& name, const UTF16String& help) {
   return new T(name, help);
@@ -96,6 +110,8 @@ const DataCommand kDataCommands[] = {
     {"json.format", "json.format <file> - prints a JSON file in compact form.",
      &Make<JsonFormat>},
     {"guid.new", "guid.new - prints a new unique GUID.", &Make<GuidNew>},
+    {"profile.dump", "profile.dump - prints the code profiler's data, one line per profile.",
+     &Make<ProfileDump>},
 };
 
 }  // namespace

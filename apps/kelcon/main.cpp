@@ -55,6 +55,7 @@ constexpr const char* kUsage =
     "  json.check FILE                 parse a JSON file, report its shape or the error\n"
     "  json.format FILE                print a JSON file in compact form\n"
     "  guid.new                        print a new unique GUID\n"
+    "  profile.dump                    print the code profiler's data\n"
     "\n"
     "Exit status: 0 when every command ran, 1 when a command was unknown or failed,\n"
     "2 for a usage error.\n";

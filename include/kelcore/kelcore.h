@@ -18,9 +18,12 @@
 #include <kelcore/console/UTF16OutputStream.h>
 #include <kelcore/debug/Assert.h>
 #include <kelcore/debug/AsyncTraceHandler.h>
+#include <kelcore/debug/CodeProfiler.h>
 #include <kelcore/debug/DebugDatabase.h>
 #include <kelcore/debug/DebugStreamBuffers.h>
 #include <kelcore/debug/DefaultTraceHandler.h>
+#include <kelcore/debug/GlobalTimeMeasurement.h>
+#include <kelcore/debug/ProfileDataLog.h>
 #include <kelcore/debug/RollingTraceHandler.h>
 #include <kelcore/debug/SafeTraceStream.h>
 #include <kelcore/debug/TimestampTraceHandler.h>
@@ -80,6 +83,7 @@
 #include <kelcore/utility/Guid.h>
 #include <kelcore/utility/HashValue.h>
 #include <kelcore/utility/HighPrecisionTime.h>
+#include <kelcore/utility/ImmutableString.h>
 #include <kelcore/utility/LineEndings.h>
 #include <kelcore/utility/Locale.h>
 #include <kelcore/utility/LocaleSeparators.h>

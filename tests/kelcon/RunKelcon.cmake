@@ -80,6 +80,7 @@ file(WRITE "${WORK_DIR}/bad.json" "{\"a\":")
 file(WRITE "${WORK_DIR}/data.txt" "json.check ${WORK_DIR}/doc.json
 json.format ${WORK_DIR}/doc.json
 guid.new
+profile.dump
 json.check ${WORK_DIR}/bad.json
 ")
 execute_process(COMMAND "${KELCON}" --prefs "${prefs}" --no-log "${WORK_DIR}/data.txt"
@@ -87,6 +88,7 @@ execute_process(COMMAND "${KELCON}" --prefs "${prefs}" --no-log "${WORK_DIR}/dat
 expect_match("${out}" "valid JSON: an object with 2 members" "json.check")
 expect_match("${out}" "\\{\"a\":\"x\",\"b\":\\[1,2\\.5,null,true\\]\\}" "json.format")
 expect_match("${out}" "[0-9a-f]+-[0-9a-f]+-4[0-9a-f]+-[0-9a-f]+-[0-9a-f]+" "guid.new")
+expect_match("${out}" "No profiling data\\." "profile.dump")
 expect_match("${err}" "ParseObject unexpected char" "json.check error")
 if(NOT rc EQUAL 1)
   message(FATAL_ERROR "a failed json.check must make the script exit 1, got ${rc}")
