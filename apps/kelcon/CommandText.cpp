@@ -6,7 +6,9 @@ namespace kelcon {
 
 namespace {
 
-bool IsSpace(unsigned int c) { return c == ' ' || c == '\t' || c == '\r' || c == '\n'; }
+bool IsSpace(unsigned int c) {
+  return c == ' ' || c == '\t' || c == '\r' || c == '\n';
+}
 
 template <typename String>
 String Trim(const String& text) {
@@ -32,8 +34,12 @@ std::string ToNarrow(const kelcore::UTF16String& text) {
   return std::string(bytes.begin(), bytes.end());
 }
 
-kelcore::UTF16String TrimSpaces(const kelcore::UTF16String& text) { return Trim(text); }
-std::string TrimSpaces(const std::string& text) { return Trim(text); }
+kelcore::UTF16String TrimSpaces(const kelcore::UTF16String& text) {
+  return Trim(text);
+}
+std::string TrimSpaces(const std::string& text) {
+  return Trim(text);
+}
 
 std::vector<std::string> SplitWords(const std::string& text, std::size_t maxWords) {
   std::vector<std::string> words;

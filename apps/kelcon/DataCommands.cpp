@@ -1,7 +1,6 @@
 #include "DataCommands.h"
 
 #include <kelcore/console/Command.h>
-#include <kelcore/console/CommandRegistry.h>
 #include <kelcore/debug/CodeProfiler.h>
 #include <kelcore/filesupport/File.h>
 #include <kelcore/filesupport/FileUtils.h>
@@ -14,6 +13,7 @@
 #include <stdexcept>
 #include <string>
 
+#include "CommandTable.h"
 #include "CommandText.h"
 
 namespace kelcon {
@@ -93,40 +93,24 @@ class ProfileDump : public Command {
   }
 };
 
-template <typename T>
-Command* Make(const UTF16String& name, const UTF16String& help) {
-  return new T(name, help);
-}
-
-struct DataCommand {
-  const char* name;
-  const char* help;
-  kelcore::console::CommandFactory factory;
-};
-
-const DataCommand kDataCommands[] = {
+const CommandEntry kDataCommands[] = {
     {"json.check", "json.check <file> - parses a JSON file and reports its shape or the error.",
-     &Make<JsonCheck>},
+     &MakeCommand<JsonCheck>},
     {"json.format", "json.format <file> - prints a JSON file in compact form.",
-     &Make<JsonFormat>},
-    {"guid.new", "guid.new - prints a new unique GUID.", &Make<GuidNew>},
+     &MakeCommand<JsonFormat>},
+    {"guid.new", "guid.new - prints a new unique GUID.", &MakeCommand<GuidNew>},
     {"profile.dump", "profile.dump - prints the code profiler's data, one line per profile.",
-     &Make<ProfileDump>},
+     &MakeCommand<ProfileDump>},
 };
 
 }  // namespace
 
 void RegisterDataCommands() {
-  for (const DataCommand& command : kDataCommands) {
-    kelcore::console::CommandRegistry::RegisterCommand(ToUTF16(command.name),
-                                                       ToUTF16(command.help), command.factory);
-  }
+  RegisterCommands(kDataCommands);
 }
 
 void UnregisterDataCommands() {
-  for (const DataCommand& command : kDataCommands) {
-    kelcore::console::CommandRegistry::UnregisterCommand(ToUTF16(command.name));
-  }
+  UnregisterCommands(kDataCommands);
 }
 
 }  // namespace kelcon

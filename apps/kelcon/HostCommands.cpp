@@ -1,7 +1,6 @@
 #include "HostCommands.h"
 
 #include <kelcore/console/Command.h>
-#include <kelcore/console/CommandRegistry.h>
 #include <kelcore/console/ConsoleCommands.h>
 #include <kelcore/filesupport/File.h>
 #include <kelcore/proplist/PropList.h>
@@ -15,6 +14,7 @@
 #include <system_error>
 #include <vector>
 
+#include "CommandTable.h"
 #include "CommandText.h"
 
 namespace kelcon {
@@ -125,45 +125,31 @@ class PlistSet : public Command {
   }
 };
 
-template <typename T>
-Command* Make(const UTF16String& name, const UTF16String& help) {
-  return new T(name, help);
-}
-
-struct HostCommand {
-  const char* name;
-  const char* help;
-  kelcore::console::CommandFactory factory;
-};
-
-const HostCommand kHostCommands[] = {
-    {"help", "help - lists the commands.", &Make<Help>},
-    {"quit", "quit - leaves the console (Ctrl-D does the same).", &Make<Quit>},
+const CommandEntry kHostCommands[] = {
+    {"help", "help - lists the commands.", &MakeCommand<Help>},
+    {"quit", "quit - leaves the console (Ctrl-D does the same).", &MakeCommand<Quit>},
     {"plist.print", "plist.print <file> - loads a property list and prints it as XML.",
-     &Make<PlistPrint>},
+     &MakeCommand<PlistPrint>},
     {"plist.set",
      "plist.set <file> <key> <type> <value> - sets a value in a property list file and saves "
      "it; type is ustring, string, bool, uint16, uint32, int32, int64, uint64, float or "
      "double.",
-     &Make<PlistSet>},
+     &MakeCommand<PlistSet>},
 };
 
 }  // namespace
 
 void RegisterHostCommands() {
   quitRequested = false;
-  for (const HostCommand& command : kHostCommands) {
-    kelcore::console::CommandRegistry::RegisterCommand(ToUTF16(command.name),
-                                                       ToUTF16(command.help), command.factory);
-  }
+  RegisterCommands(kHostCommands);
 }
 
 void UnregisterHostCommands() {
-  for (const HostCommand& command : kHostCommands) {
-    kelcore::console::CommandRegistry::UnregisterCommand(ToUTF16(command.name));
-  }
+  UnregisterCommands(kHostCommands);
 }
 
-bool QuitRequested() { return quitRequested; }
+bool QuitRequested() {
+  return quitRequested;
+}
 
 }  // namespace kelcon

@@ -152,4 +152,6 @@ int Run(const Arguments& args) {
 
 }  // namespace
 
-int main(int argc, char** argv) { return Run(ParseArguments(argc, argv)); }
+int main(int argc, char** argv) {
+  return Run(ParseArguments(argc, argv));
+}
