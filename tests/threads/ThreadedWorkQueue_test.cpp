@@ -70,7 +70,9 @@ TEST(ThreadedWorkQueue, FlushWaitsForEveryWorker) {
 // due; Flush moves what is due before it waits.
 TEST(ThreadedWorkQueue, DelayedFunctionsRunInDueOrderOnTheQueuesClock) {
   ManualClock clock;
-  detail::ThreadedWorkQueue queue("delays", 2, kThreadPriorityNormal, {}, {}, clock);
+  // One worker: with two, functions due at the same moment start in order but may
+  // finish in either order.
+  detail::ThreadedWorkQueue queue("delays", 1, kThreadPriorityNormal, {}, {}, clock);
   std::mutex mutex;
   std::vector<std::string> ran;
   const auto record = [&](const char* name) {
