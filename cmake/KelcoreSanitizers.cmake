@@ -8,3 +8,17 @@ if(KELCORE_SANITIZE)
   add_compile_options(${_kel_san_flags})
   add_link_options(-fsanitize=${KELCORE_SANITIZE})
 endif()
+
+# KELCORE_FUZZ instruments everything for coverage-guided fuzzing, with AddressSanitizer
+# and UndefinedBehaviorSanitizer; only the fuzz targets link libFuzzer's driver.
+if(KELCORE_FUZZ)
+  if(NOT CMAKE_CXX_COMPILER_ID MATCHES "Clang")
+    message(FATAL_ERROR "KELCORE_FUZZ needs clang (for example CXX=clang++-14)")
+  endif()
+  if(KELCORE_SANITIZE)
+    message(FATAL_ERROR "KELCORE_FUZZ brings its own sanitizers; leave KELCORE_SANITIZE empty")
+  endif()
+  add_compile_options(-fsanitize=fuzzer-no-link,address,undefined -fno-omit-frame-pointer
+                      -fno-sanitize-recover=undefined)
+  add_link_options(-fsanitize=address,undefined)
+endif()

@@ -7,8 +7,13 @@ if(MSVC)
   endif()
 else()
   target_compile_options(kelcore_warnings INTERFACE -Wall -Wextra -Wpedantic
-                         -Wshadow=local -Wnon-virtual-dtor -Wcast-align
-                         -Woverloaded-virtual -Wnull-dereference)
+                         -Wnon-virtual-dtor -Wcast-align -Woverloaded-virtual
+                         -Wnull-dereference)
+  if(CMAKE_CXX_COMPILER_ID MATCHES "Clang")
+    target_compile_options(kelcore_warnings INTERFACE -Wshadow-uncaptured-local)
+  else()
+    target_compile_options(kelcore_warnings INTERFACE -Wshadow=local)
+  endif()
   if(KELCORE_WERROR)
     target_compile_options(kelcore_warnings INTERFACE -Werror)
   endif()

@@ -14,5 +14,5 @@ kel_build() {
 
 # Tools (clangd, clang-tidy) find the compile database at the top of the tree.
 kel_link_compile_commands() {
-  [[ -e compile_commands.json ]] || ln -s "$1/compile_commands.json" compile_commands.json
+  [[ -e compile_commands.json || -L compile_commands.json ]] || ln -s "$1/compile_commands.json" compile_commands.json
 }

@@ -2,6 +2,7 @@
 # Installs the Debian packages kelcore needs that are not installed yet.
 #   scripts/install-deps.sh           what building, running and testing need
 #   scripts/install-deps.sh --bench   also the peer libraries the benchmarks compare with
+#   scripts/install-deps.sh --fuzz    also clang and its fuzzing runtime
 set -euo pipefail
 
 packages=(
@@ -11,6 +12,8 @@ packages=(
 )
 if [[ "${1:-}" == "--bench" ]]; then
   packages+=(libbenchmark-dev libmimalloc-dev libjemalloc-dev libtbb-dev nlohmann-json3-dev rapidjson-dev)
+elif [[ "${1:-}" == "--fuzz" ]]; then
+  packages+=(clang-14 libclang-rt-14-dev)
 fi
 
 missing=()
