@@ -1,7 +1,9 @@
 #!/usr/bin/env bash
 # Builds kelcore and runs every test: first a warnings-as-errors build (which also
 # installs the library and builds a program against it), then the same suite built
-# with AddressSanitizer and UndefinedBehaviorSanitizer, and again with ThreadSanitizer.
+# with AddressSanitizer and UndefinedBehaviorSanitizer, and again with ThreadSanitizer;
+# last, every fuzz target replays its corpus and is fuzzed for KELCORE_FUZZ_SECONDS
+# (30 by default) under clang's sanitizers.
 set -euo pipefail
 cd "$(dirname "$0")/.."
 scripts/install-deps.sh
@@ -23,3 +25,5 @@ run_suite build/test -DCMAKE_BUILD_TYPE=RelWithDebInfo
 run_suite build/test-asan -DCMAKE_BUILD_TYPE=Debug -DCMAKE_CXX_FLAGS_DEBUG="-g -O1" -DKELCORE_SANITIZE=address,undefined
 run_suite build/test-tsan -DCMAKE_BUILD_TYPE=Debug -DCMAKE_CXX_FLAGS_DEBUG="-g -O1" -DKELCORE_SANITIZE=thread \
   -DKELCORE_BUILD_APPS=OFF
+
+scripts/fuzz.sh "${KELCORE_FUZZ_SECONDS:-30}"
