@@ -112,6 +112,10 @@ bool ReplaceIllegalFileNameCharacters(UTF16String& name, UTF16Char replacement) 
   ReplaceReservedName(name, replacement);
   ReplaceTrailingDotsAndSpaces(name, replacement);
   ReplaceLeadingDots(name, replacement);
+  // Trimming may have uncovered a reserved name ("con " or "..aux.txt" when removing,
+  // "co." with the replacement "n"): treat it once more. What that leaves is never
+  // reserved and needs no more trimming.
+  ReplaceReservedName(name, replacement);
   if (replacement == 0 && name.empty()) name.assign(1, kLastResort);
   return name != original;
 }

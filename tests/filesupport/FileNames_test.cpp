@@ -57,6 +57,12 @@ const CleaningCase kCleaningCases[] = {
     {u"..", u'_', u"__"},
     {u"..", 0, u"-"},
     {u"   ", 0, u"-"},
+    // Found by fuzzing: trimming uncovers a reserved name, which is treated again.
+    {u"con ", 0, u"con-"},
+    {u"..aux.txt", 0, u"-.txt"},
+    {u".aux.\x1F.x", 0, u"-..x"},
+    {u"co.", u'n', u"conn"},
+    {u".ux.txt", u'a', u"auxatxt"},
     {u"clean name.txt", u'_', u"clean name.txt"},
     {u"caf\u00E9 \u65E5\u672C.txt", 0, u"caf\u00E9 \u65E5\u672C.txt"},
 };
